@@ -4,6 +4,8 @@
 #pragma once
 
 #include <cstdint>
+#include <cstring>
+#include <type_traits>
 
 #include "engine/alloc.h"
 
@@ -30,10 +32,16 @@ long registry_size() noexcept;
 
 // Allocates a zeroed record of kind T, writes its tag and registers it; null when out
 // of memory (nothing is reported: the caller reports with its own message).
+// The tag is the record's first word, whatever the record calls it.
+template <class T> void set_tag(T* rec, uint32_t tag) noexcept {
+    static_assert(std::is_standard_layout_v<T> && sizeof(T) >= 4);
+    std::memcpy(static_cast<void*>(rec), &tag, sizeof tag);
+}
+
 template <class T> T* new_record() noexcept {
     auto* rec = static_cast<T*>(eng_calloc(1, sizeof(T)));
     if (!rec) return nullptr;
-    rec->tag = T::kTag;
+    set_tag(rec, T::kTag);
     if (!registry_add(rec, T::kTag)) {
         eng_free(rec);
         return nullptr;
@@ -44,7 +52,7 @@ template <class T> T* new_record() noexcept {
 // Clears the tag, unregisters and frees a record made by new_record.
 template <class T> void free_record(T* rec) noexcept {
     if (!rec) return;
-    rec->tag = 0;
+    set_tag(rec, 0);
     registry_remove(rec);
     eng_free(rec);
 }
