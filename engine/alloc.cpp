@@ -54,8 +54,14 @@ void alloc_fail_at(long n, bool sticky) noexcept {
     g_alloc.fired = false;
 }
 
-long alloc_count() noexcept { return g_alloc.count; }
-void alloc_count_reset() noexcept { g_alloc.count = 0; }
-long alloc_outstanding() noexcept { return g_alloc.outstanding; }
+long alloc_count() noexcept {
+    return g_alloc.count;
+}
+void alloc_count_reset() noexcept {
+    g_alloc.count = 0;
+}
+long alloc_outstanding() noexcept {
+    return g_alloc.outstanding;
+}
 
 } // namespace vrx::engine

@@ -36,8 +36,7 @@ extern "C" {
 
 VRX_API int32_t VRX_GetLastError(char* dst) noexcept {
     if (!dst) return -1;
-    std::memcpy(dst, vrx::engine::g_eng.last_error,
-                std::strlen(vrx::engine::g_eng.last_error) + 1);
+    std::memcpy(dst, vrx::engine::g_eng.last_error, std::strlen(vrx::engine::g_eng.last_error) + 1);
     return 0;
 }
 

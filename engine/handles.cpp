@@ -98,7 +98,9 @@ uint32_t registry_tag(const void* rec) noexcept {
     return s.key == rec ? s.tag : 0;
 }
 
-long registry_size() noexcept { return static_cast<long>(g_registry.used); }
+long registry_size() noexcept {
+    return static_cast<long>(g_registry.used);
+}
 
 namespace {
 
@@ -150,14 +152,32 @@ constexpr CheckInfo kBillboard{TAG_BILLBOARD, "The ID is not ID_BILLBOARD.\n", f
 
 } // namespace
 
-uint32_t chk_world(const void* h) noexcept { return check(h, kWorld); }
-uint32_t chk_object(const void* h) noexcept { return check(h, kObject); }
-uint32_t chk_camera(const void* h) noexcept { return check(h, kCamera); }
-uint32_t chk_material(const void* h) noexcept { return check(h, kMaterial); }
-uint32_t chk_texture(const void* h) noexcept { return check(h, kTexture); }
-uint32_t chk_omni(const void* h) noexcept { return check(h, kOmni); }
-uint32_t chk_image(const void* h) noexcept { return check(h, kImage); }
-uint32_t chk_window(const void* h) noexcept { return check(h, kWindow); }
-uint32_t chk_billboard(const void* h) noexcept { return check(h, kBillboard); }
+uint32_t chk_world(const void* h) noexcept {
+    return check(h, kWorld);
+}
+uint32_t chk_object(const void* h) noexcept {
+    return check(h, kObject);
+}
+uint32_t chk_camera(const void* h) noexcept {
+    return check(h, kCamera);
+}
+uint32_t chk_material(const void* h) noexcept {
+    return check(h, kMaterial);
+}
+uint32_t chk_texture(const void* h) noexcept {
+    return check(h, kTexture);
+}
+uint32_t chk_omni(const void* h) noexcept {
+    return check(h, kOmni);
+}
+uint32_t chk_image(const void* h) noexcept {
+    return check(h, kImage);
+}
+uint32_t chk_window(const void* h) noexcept {
+    return check(h, kWindow);
+}
+uint32_t chk_billboard(const void* h) noexcept {
+    return check(h, kBillboard);
+}
 
 } // namespace vrx::engine

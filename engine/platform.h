@@ -8,7 +8,9 @@
 namespace vrx::engine {
 
 // True for either separator.
-constexpr bool is_path_sep(char c) noexcept { return c == '\\' || c == '/'; }
+constexpr bool is_path_sep(char c) noexcept {
+    return c == '\\' || c == '/';
+}
 
 // The base name of a path: the text after its last separator of either kind.
 const char* path_base_name(const char* path) noexcept;

@@ -11,7 +11,10 @@
 #include <png.h>
 #endif
 
-enum { W = 240, H = 320 };
+enum {
+    W = 240,
+    H = 320
+};
 static uint16_t frame[W * H];
 
 /* RGB565 to 8-bit channels by bit replication, so 0x1F becomes 0xFF exactly. */

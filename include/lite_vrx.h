@@ -59,7 +59,12 @@ typedef struct WINDOW_INFO {
 } WINDOW_INFO;
 
 /* Pixel-format codes of the screen and of textures. */
-enum { VRX_FMT_RGB565 = 0, VRX_FMT_RGB888 = 2, VRX_FMT_ARGB8888 = 3, VRX_FMT_RGBA4444 = 4 };
+enum {
+    VRX_FMT_RGB565 = 0,
+    VRX_FMT_RGB888 = 2,
+    VRX_FMT_ARGB8888 = 3,
+    VRX_FMT_RGBA4444 = 4
+};
 
 /* Render hints for VRX_Hint. */
 enum {
@@ -202,8 +207,7 @@ VRX_API int32_t VRX_DeleteWindow(void* win) VRX_NOEXCEPT;
 VRX_API int32_t VRX_ClearRenderBuffer(int32_t r, int32_t g, int32_t b) VRX_NOEXCEPT;
 /* Copies a w x h block from the host's arrays into the buffers at (x, y). */
 VRX_API int32_t VRX_CopyToRenderBuffer(int32_t x, int32_t y, int32_t w, int32_t h,
-                                       const uint16_t* colors,
-                                       const int32_t* depths) VRX_NOEXCEPT;
+                                       const uint16_t* colors, const int32_t* depths) VRX_NOEXCEPT;
 /* Copies a w x h block from the buffers at (x, y) into the host's arrays. */
 VRX_API int32_t VRX_CopyFromRenderBuffer(int32_t x, int32_t y, int32_t w, int32_t h,
                                          uint16_t* colors, int32_t* depths) VRX_NOEXCEPT;

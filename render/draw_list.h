@@ -8,7 +8,11 @@ namespace vrx::render {
 
 inline constexpr int32_t kDrawListCap = 256;
 
-enum DrawKind : int32_t { DRAW_TRANSLUCENT = 1, DRAW_BILLBOARD = 2, DRAW_SORTED = 3 };
+enum DrawKind : int32_t {
+    DRAW_TRANSLUCENT = 1,
+    DRAW_BILLBOARD = 2,
+    DRAW_SORTED = 3
+};
 
 struct DRAW_ENTRY {
     void* item;   // object or billboard

@@ -15,7 +15,8 @@ VRX_API int32_t VRX_Hint(int32_t hint, uint32_t value) noexcept {
     uint32_t& flags = g_eng.eng_flags;
     switch (hint) {
         case HINT_PERSPECTIVE:
-            flags = value ? (flags | engine::FLAG_PERSPECTIVE) : (flags & ~engine::FLAG_PERSPECTIVE);
+            flags =
+                value ? (flags | engine::FLAG_PERSPECTIVE) : (flags & ~engine::FLAG_PERSPECTIVE);
             return 0;
         case HINT_DEPTH:
             // Sorting and depth testing exclude each other.

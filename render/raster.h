@@ -12,9 +12,9 @@ namespace vrx::render {
 
 // One end of the current span (eight 32-bit words).
 struct SPAN_EDGE {
-    int32_t x;  // x on this scanline, 16.16
-    int32_t w;  // reciprocal depth, 26 fraction bits
-    int32_t r;  // colour channels, 16.16 in 0 to 255.0
+    int32_t x; // x on this scanline, 16.16
+    int32_t w; // reciprocal depth, 26 fraction bits
+    int32_t r; // colour channels, 16.16 in 0 to 255.0
     int32_t g;
     int32_t b;
     int32_t a;
@@ -28,18 +28,18 @@ using SpanFn = void (*)(const SPAN_EDGE* left, const SPAN_EDGE* right, int32_t y
 
 // Globals shared by the drawers, the fillers and the pipeline.
 struct RasterContext {
-    SPAN_EDGE left, right;  // the span ends handed to every draw_span call
-    uint16_t* row;          // first pixel of the current scanline
-    int32_t* zrow;          // first depth of the current scanline (depth drawers)
-    uint16_t flat_color;    // RGB565 colour of the first vertex (flat and textured drawers)
+    SPAN_EDGE left, right;          // the span ends handed to every draw_span call
+    uint16_t* row;                  // first pixel of the current scanline
+    int32_t* zrow;                  // first depth of the current scanline (depth drawers)
+    uint16_t flat_color;            // RGB565 colour of the first vertex (flat and textured drawers)
     int32_t flat_r, flat_g, flat_b; // that vertex's channels, 16.16
-    const void* texels;     // current texture's pixels (16- or 32-bit)
-    int32_t tex_umask;      // width - 1
-    int32_t tex_vmask;      // height - 1
-    int32_t tex_wlog2;      // log2 of width
-    int32_t tex_ushift;     // 24 - log2 width
-    int32_t tex_vshift;     // 24 - log2 height
-    int32_t blend_a;        // opacity of the current material as a weight 0 to 256
+    const void* texels;             // current texture's pixels (16- or 32-bit)
+    int32_t tex_umask;              // width - 1
+    int32_t tex_vmask;              // height - 1
+    int32_t tex_wlog2;              // log2 of width
+    int32_t tex_ushift;             // 24 - log2 width
+    int32_t tex_vshift;             // 24 - log2 height
+    int32_t blend_a;                // opacity of the current material as a weight 0 to 256
 };
 
 extern RasterContext g_raster;
@@ -109,8 +109,7 @@ void build_span_table(int32_t set) noexcept;
 inline int32_t span_rejected(int32_t x0, int32_t x1, int32_t y) noexcept {
     const engine::ENG_STATE& e = engine::g_eng;
     if (!e.clip_on) return 0;
-    return (y >= e.clip_bottom || y < e.clip_top || x0 >= e.clip_right || x1 < e.clip_left) ? 1
-                                                                                          : 0;
+    return (y >= e.clip_bottom || y < e.clip_top || x0 >= e.clip_right || x1 < e.clip_left) ? 1 : 0;
 }
 inline int32_t pixel_clipped(int32_t x) noexcept {
     const engine::ENG_STATE& e = engine::g_eng;

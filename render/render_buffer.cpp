@@ -27,7 +27,9 @@ size_t buffer_pixels() noexcept {
 
 // Word stores through memcpy: the host's colour buffer need only be 2-byte aligned,
 // and the compiler turns each into a plain (vectorisable) store.
-inline void store_word(unsigned char* p, uint32_t v) noexcept { std::memcpy(p, &v, 4); }
+inline void store_word(unsigned char* p, uint32_t v) noexcept {
+    std::memcpy(p, &v, 4);
+}
 
 // The mask that drops the top bit of each RGB565 channel after a halving shift.
 constexpr uint32_t kHalfMask = 0x7BEF;
@@ -52,8 +54,8 @@ void FillRect(int32_t x, int32_t y, int32_t w, int32_t h, uint16_t color) noexce
     if (w < 1 || h < 1) return;
     const bool depth = depth_clear_wanted() && g_eng.depth_buf;
     for (int32_t r = 0; r < h; ++r) {
-        size_t at = static_cast<size_t>(y + r) * static_cast<size_t>(g_eng.buf_w) +
-                    static_cast<size_t>(x);
+        size_t at =
+            static_cast<size_t>(y + r) * static_cast<size_t>(g_eng.buf_w) + static_cast<size_t>(x);
         uint16_t* c = g_eng.color_buf + at;
         for (int32_t i = 0; i < w; ++i) c[i] = color;
         if (depth) {
@@ -117,8 +119,8 @@ int32_t EnsureDepthBuffer() noexcept {
 int32_t EnterDoubleMode() noexcept {
     // The engine draws into its own buffers of twice the screen size while doubled;
     // the swap reduces the picture into the start of that colour buffer.
-    const size_t pixels = 4 * static_cast<size_t>(g_eng.screen_w) *
-                          static_cast<size_t>(g_eng.screen_h);
+    const size_t pixels =
+        4 * static_cast<size_t>(g_eng.screen_w) * static_cast<size_t>(g_eng.screen_h);
     auto* color = static_cast<uint16_t*>(engine::eng_calloc(pixels, sizeof(uint16_t)));
     int32_t* depth = nullptr;
     if (color && !(g_eng.eng_flags & engine::FLAG_SORT))
@@ -150,7 +152,8 @@ void LeaveDoubleMode() noexcept {
     RenderBufFree();
     g_eng.buf_w = g_eng.screen_w;
     g_eng.buf_h = g_eng.screen_h;
-    if (RenderBufAlloc() != 0) engine::ReportError("Allocate depth buffer fail in LeaveDoubleMode!!\n");
+    if (RenderBufAlloc() != 0)
+        engine::ReportError("Allocate depth buffer fail in LeaveDoubleMode!!\n");
     g_eng.color_buf = nullptr;
     g_eng.depth_buf = g_eng.own_depth_buf;
     scale_all_windows(false);
@@ -198,7 +201,8 @@ VRX_API int32_t VRX_ClearRenderBuffer(int32_t r, int32_t g, int32_t b) noexcept 
                               static_cast<uint32_t>(pixels * 4));
         uint32_t color = ((ur & 0xF8) << 8) + ((ug & 0xFC) << 3) + ((ub & 0xFF) >> 3);
         color &= 0xFFFF;
-        render::FillWords(g_eng.color_buf, color | (color << 16), static_cast<uint32_t>(pixels * 2));
+        render::FillWords(g_eng.color_buf, color | (color << 16),
+                          static_cast<uint32_t>(pixels * 2));
     } else {
         // Four bytes per pixel, in whole groups of four pixels.
         uint32_t value = ur + ((ug & ~3u) << 8) + ((ub & ~7u) << 16);
@@ -216,8 +220,8 @@ VRX_API int32_t VRX_CopyToRenderBuffer(int32_t x, int32_t y, int32_t w, int32_t 
     if (!block_ok(x, y, w, h, colors, "VRX_CopyToRenderBuffer")) return -1;
     const bool with_depth = g_eng.depth_buf && depths;
     for (int32_t r = 0; r < h; ++r) {
-        size_t at = static_cast<size_t>(y + r) * static_cast<size_t>(g_eng.buf_w) +
-                    static_cast<size_t>(x);
+        size_t at =
+            static_cast<size_t>(y + r) * static_cast<size_t>(g_eng.buf_w) + static_cast<size_t>(x);
         size_t from = static_cast<size_t>(r) * static_cast<size_t>(w);
         std::memcpy(g_eng.color_buf + at, colors + from, static_cast<size_t>(w) * 2);
         if (with_depth)
@@ -231,12 +235,11 @@ VRX_API int32_t VRX_CopyFromRenderBuffer(int32_t x, int32_t y, int32_t w, int32_
     if (!block_ok(x, y, w, h, colors, "VRX_CopyFromRenderBuffer")) return -1;
     const bool with_depth = g_eng.depth_buf && depths;
     for (int32_t r = 0; r < h; ++r) {
-        size_t at = static_cast<size_t>(y + r) * static_cast<size_t>(g_eng.buf_w) +
-                    static_cast<size_t>(x);
+        size_t at =
+            static_cast<size_t>(y + r) * static_cast<size_t>(g_eng.buf_w) + static_cast<size_t>(x);
         size_t to = static_cast<size_t>(r) * static_cast<size_t>(w);
         std::memcpy(colors + to, g_eng.color_buf + at, static_cast<size_t>(w) * 2);
-        if (with_depth)
-            std::memcpy(depths + to, g_eng.depth_buf + at, static_cast<size_t>(w) * 4);
+        if (with_depth) std::memcpy(depths + to, g_eng.depth_buf + at, static_cast<size_t>(w) * 4);
     }
     return 0;
 }

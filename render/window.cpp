@@ -67,7 +67,8 @@ bool info_ok(const WINDOW_INFO* info, const char* op) noexcept {
 } // namespace
 
 void WindowRecalc(VPORT* w) noexcept {
-    w->aspect = engine::Div(wrap_mul(w->width, 0x10000), wrap_mul(w->height, 0x10000));
+    // The ratio of the two whole sizes comes out of the division as a 16.16 value.
+    w->aspect = engine::Div(w->width, w->height);
     recalc_projection(w);
     w->sc_x = w->sc_y = 0;
     w->sc_w = w->width;
@@ -112,7 +113,9 @@ using render::VPORT;
 
 namespace {
 // The window behind a handle that passed chk_window.
-VPORT* as_window(void* h) noexcept { return static_cast<VPORT*>(h); }
+VPORT* as_window(void* h) noexcept {
+    return static_cast<VPORT*>(h);
+}
 } // namespace
 
 extern "C" {
@@ -184,8 +187,7 @@ VRX_API int32_t VRX_GetWindowInfo(void* win, WINDOW_INFO* info) noexcept {
     return 0;
 }
 
-VRX_API int32_t VRX_WindowScissor(void* win, int32_t x, int32_t y, int32_t w,
-                                  int32_t h) noexcept {
+VRX_API int32_t VRX_WindowScissor(void* win, int32_t x, int32_t y, int32_t w, int32_t h) noexcept {
     if (engine::chk_window(win)) {
         engine::ReportError("Wrong whd in VRX_WindowScissor!!\n");
         return -1;
@@ -268,7 +270,8 @@ VRX_API int32_t VRX_ClearWindow(void* win, const uint8_t* rgb) noexcept {
         engine::ReportError("Window outside the render buffer in ENG_ClearWindow!!\n");
         return -1;
     }
-    auto color = static_cast<uint16_t>(((rgb[0] >> 3) << 11) | ((rgb[1] >> 2) << 5) | (rgb[2] >> 3));
+    auto color =
+        static_cast<uint16_t>(((rgb[0] >> 3) << 11) | ((rgb[1] >> 2) << 5) | (rgb[2] >> 3));
     render::FillRect(static_cast<int32_t>(x), static_cast<int32_t>(y), v->sc_w, v->sc_h, color);
     return 0;
 }

@@ -102,10 +102,8 @@ TEST_F(EngineTest, DataPathGetsOneTrailingBackslash) {
         const char* in;
         const char* stored;
     };
-    const Case cases[] = {{"data", "data\\"},
-                          {"data\\", "data\\"},
-                          {"a\\b/c", "a\\b/c\\"},
-                          {"", ""}};
+    const Case cases[] = {
+        {"data", "data\\"}, {"data\\", "data\\"}, {"a\\b/c", "a\\b/c\\"}, {"", ""}};
     for (const Case& c : cases) {
         ASSERT_EQ(VRX_SetDefaultDataPath(c.in), 0);
         EXPECT_STREQ(g_eng.data_path, c.stored) << c.in;

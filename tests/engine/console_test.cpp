@@ -1,0 +1,179 @@
+// ReportError, last_error and the on-screen console.
+#include <gtest/gtest.h>
+
+#include <string>
+
+#include "engine/console.h"
+#include "engine/error.h"
+#include "engine/state.h"
+#include "support/engine_fixture.h"
+
+using namespace vrx::engine;
+using vrx::test::EngineTest;
+
+namespace {
+
+// Glyph bit (k, r) of the font, read the way the console draws it.
+bool glyph_bit(int c, int k, int r) {
+    uint32_t word = ConFont[c * 4 + r / 4];
+    return (word >> (31 - 8 * (r % 4) - k)) & 1u;
+}
+
+class Console : public EngineTest {
+  protected:
+    // True when the cell at (col, row) shows glyph c at scale 1 in the console colour.
+    bool cell_shows(int col, int row, int c) const {
+        for (int r = 0; r < 16; ++r)
+            for (int k = 0; k < 8; ++k) {
+                uint16_t want = glyph_bit(c, k, r) ? 0xFFFF : 0;
+                if (pixel(col * 8 + k, row * 16 + r) != want) return false;
+            }
+        return true;
+    }
+};
+
+TEST_F(Console, FontIsCodePage437) {
+    // 'A' has a crossbar and open bottom corners; the full block is all set; 0 is blank.
+    int a_bits = 0, block_bits = 0, blank_bits = 0;
+    for (int r = 0; r < 16; ++r)
+        for (int k = 0; k < 8; ++k) {
+            a_bits += glyph_bit('A', k, r);
+            block_bits += glyph_bit(0xDB, k, r);
+            blank_bits += glyph_bit(0, k, r) + glyph_bit(' ', k, r);
+        }
+    EXPECT_EQ(block_bits, 128);
+    EXPECT_EQ(blank_bits, 0);
+    EXPECT_GT(a_bits, 20);
+    // The smiley face (0x01) is not blank: the font covers the symbol range.
+    int face_bits = 0;
+    for (int r = 0; r < 16; ++r)
+        for (int k = 0; k < 8; ++k) face_bits += glyph_bit(1, k, r);
+    EXPECT_GT(face_bits, 20);
+}
+
+TEST_F(Console, GeometryAt240x320) {
+    const CONSOLE& c = g_eng.con;
+    EXPECT_EQ(c.con_cols, 30);
+    EXPECT_EQ(c.con_rows, 20);
+    EXPECT_EQ(c.con_cell_w, 8);
+    EXPECT_EQ(c.con_cell_h, 16);
+    EXPECT_EQ(c.con_color, 0xFFFF);
+}
+
+TEST_F(Console, BackspaceMovesBackAndDrawsOver) {
+    ConPutString("AB\bC");
+    EXPECT_EQ(g_eng.con.con_col, 2);
+    EXPECT_EQ(g_eng.con.con_row, 0);
+    EXPECT_TRUE(cell_shows(0, 0, 'A'));
+    EXPECT_TRUE(cell_shows(1, 0, 'C'));
+    ConPutString("\b\b\b\b"); // never below column 0
+    EXPECT_EQ(g_eng.con.con_col, 0);
+}
+
+TEST_F(Console, WrapsLinesAndRowsWithoutScrolling) {
+    std::string line(30, 'x');
+    ConPutString(line.c_str());
+    EXPECT_EQ(g_eng.con.con_col, 0); // the 30th character ends the line
+    EXPECT_EQ(g_eng.con.con_row, 1);
+    ConPutString("y");
+    EXPECT_TRUE(cell_shows(0, 1, 'y'));
+
+    g_eng.con.con_row = 19;
+    g_eng.con.con_col = 5;
+    ConPutString("\n");
+    EXPECT_EQ(g_eng.con.con_row, 0);
+    EXPECT_EQ(g_eng.con.con_col, 0);
+    ConPutString("ab\rc");
+    EXPECT_TRUE(cell_shows(0, 0, 'c'));
+    EXPECT_TRUE(cell_shows(1, 0, 'b'));
+}
+
+TEST_F(Console, ScaleIsClampedAndSizesFollow) {
+    struct Case {
+        int sx, sy, want_x, want_y, cols, rows;
+    };
+    const Case cases[] = {
+        {0, 9, 1, 8, 30, 2}, {2, 2, 2, 2, 15, 10}, {-4, 1, 1, 1, 30, 20}, {8, 3, 8, 3, 3, 6}};
+    for (const Case& c : cases) {
+        ConSetScale(c.sx, c.sy);
+        EXPECT_EQ(g_eng.con.con_scale_x, c.want_x);
+        EXPECT_EQ(g_eng.con.con_scale_y, c.want_y);
+        EXPECT_EQ(g_eng.con.con_cell_w, 8 * c.want_x);
+        EXPECT_EQ(g_eng.con.con_cell_h, 16 * c.want_y);
+        EXPECT_EQ(g_eng.con.con_cols, c.cols);
+        EXPECT_EQ(g_eng.con.con_rows, c.rows);
+    }
+    ConSetScale(1, 1);
+}
+
+TEST_F(Console, ScaledGlyphFillsBlocks) {
+    ConSetScale(2, 3);
+    ConDrawChar(10, 20, 0xDB); // full block: 16 x 48 pixels of console colour
+    for (int y = 20; y < 20 + 48; ++y)
+        for (int x = 10; x < 10 + 16; ++x) ASSERT_EQ(pixel(x, y), 0xFFFF) << x << "," << y;
+    EXPECT_EQ(pixel(9, 20), 0);
+    EXPECT_EQ(pixel(26, 20), 0);
+    ConSetScale(1, 1);
+}
+
+TEST_F(Console, DrawingNearTheEdgeStaysInsideTheBuffer) {
+    // The last column and row of cells and a glyph hanging off the buffer edge.
+    ConDrawChar(kW - 4, kH - 8, 0xDB);
+    EXPECT_EQ(pixel(kW - 1, kH - 1), 0xFFFF);
+    EXPECT_EQ(pixel(kW - 5, kH - 1), 0);
+}
+
+TEST_F(Console, ReopenAfterDoubledCloseKeepsTheConsoleInsideTheBuffer) {
+    ConSetScale(2, 2); // as a close in doubled mode leaves it
+    VRX_Close();
+    ASSERT_EQ(VRX_Open(0, kW, kH, VRX_FMT_RGB565), 0);
+    const CONSOLE& c = g_eng.con;
+    EXPECT_LE(c.con_cols * c.con_cell_w, g_eng.buf_w);
+    EXPECT_LE(c.con_rows * c.con_cell_h, g_eng.buf_h);
+    ConSetScale(1, 1);
+}
+
+TEST_F(Console, NoColourBufferOnlyKeepsTheText) {
+    g_eng.color_buf = nullptr;
+    ReportError("quiet %d\n", 5);
+    EXPECT_EQ(last_error(), "quiet 5\n");
+    g_eng.color_buf = color.data();
+}
+
+TEST_F(EngineTest, ReportedMessagesAccumulateAndRestartAt1024) {
+    ReportError("first %s\n", "one");
+    ReportError("second\n");
+    EXPECT_EQ(last_error(), "first one\nsecond\n");
+
+    // 1000 bytes held: 30 more would reach 1024, so the text restarts; 20 more fit.
+    std::string fill(1000, 'f');
+    std::string thirty(29, 't');
+    std::string twenty(19, 'w');
+    struct Case {
+        const std::string& add;
+        std::string want;
+    };
+    const Case cases[] = {{thirty + "\n", thirty + "\n"}, {twenty + "\n", fill + twenty + "\n"}};
+    for (const Case& c : cases) {
+        std::memcpy(g_eng.last_error, fill.c_str(), fill.size() + 1);
+        ReportError("%s", c.add.c_str());
+        EXPECT_EQ(last_error(), c.want);
+    }
+}
+
+TEST_F(EngineTest, OverlongMessagesAreCutNotOverflowed) {
+    std::string huge(5000, 'h');
+    ReportError("%s", huge.c_str());
+    EXPECT_EQ(last_error().size(), 1023u);
+}
+
+TEST_F(EngineTest, ReportedTextShowsOnTheConsole) {
+    ReportError("A\n");
+    // Cell (0, 0) holds an 'A' in white on black.
+    for (int r = 0; r < 16; ++r)
+        for (int k = 0; k < 8; ++k)
+            ASSERT_EQ(pixel(k, r), glyph_bit('A', k, r) ? 0xFFFF : 0) << k << "," << r;
+    EXPECT_EQ(g_eng.con.con_row, 1);
+}
+
+} // namespace

@@ -1,0 +1,89 @@
+// Name folding, comparison and path splitting.
+#include <gtest/gtest.h>
+
+#include <string>
+
+#include "engine/names.h"
+#include "engine/platform.h"
+
+using namespace vrx::engine;
+
+namespace {
+
+TEST(Names, StrUpperFoldsAsciiAndSkipsTwoByteCharacters) {
+    struct Case {
+        std::string in, out;
+    };
+    const Case cases[] = {
+        {"box01", "BOX01"},
+        {"MiXeD-case_9", "MIXED-CASE_9"},
+        // 0x82 0x61 is one two-byte character: its trail byte 'a' stays as it is.
+        {"a\x82"
+         "ab",
+         "A\x82"
+         "aB"},
+        {"\xb0", "\xb0"}, // a lead byte at the end
+        {"", ""},
+    };
+    for (const Case& c : cases) {
+        std::string s = c.in;
+        EXPECT_EQ(StrUpper(s.data()), s.data());
+        EXPECT_EQ(s, c.out) << c.in;
+    }
+}
+
+TEST(Names, StrCmpNoCase) {
+    struct Case {
+        const char *a, *b;
+        int sign;
+    };
+    const Case cases[] = {{"Box01", "BOX01", 0}, {"a", "ab", -1}, {"ab", "a", 1},
+                          {"abc", "ABD", -1},    {"", "", 0},     {"\xe9", "a", -1}};
+    for (const Case& c : cases) {
+        int r = StrCmpNoCase(c.a, c.b);
+        EXPECT_EQ((r > 0) - (r < 0), c.sign) << c.a << " vs " << c.b;
+    }
+    // The difference is of the folded bytes: 'a' (as 'A') minus 'c' (as 'C').
+    EXPECT_EQ(StrCmpNoCase("a", "c"), 'A' - 'C');
+}
+
+TEST(Names, StrNCmpNoCaseComparesExactlyN) {
+    EXPECT_EQ(StrNCmpNoCase("tga", "TGA", 3), 0);
+    EXPECT_EQ(StrNCmpNoCase("tgx", "TGA", 2), 0);
+    EXPECT_LT(StrNCmpNoCase("tga", "TGB", 3), 0);
+    EXPECT_EQ(StrNCmpNoCase("x", "y", 0), 0);
+    EXPECT_EQ(StrNCmpNoCase("x", "y", -3), 0);
+    // It does not stop at a terminator: "a\0b" and "a\0c" differ at the third byte.
+    EXPECT_NE(StrNCmpNoCase("a\0b", "a\0c", 3), 0);
+}
+
+TEST(Paths, SplittingAcceptsBothSeparators) {
+    struct Case {
+        const char* path;
+        const char* base;
+        size_t dir_len;
+    };
+    const Case cases[] = {{"data\\tex\\wall.tga", "wall.tga", 9},
+                          {"data/tex/wall.tga", "wall.tga", 9},
+                          {"data\\tex/wall.tga", "wall.tga", 9},
+                          {"wall.tga", "wall.tga", 0},
+                          {"dir\\", "", 4}};
+    for (const Case& c : cases) {
+        EXPECT_STREQ(path_base_name(c.path), c.base) << c.path;
+        EXPECT_EQ(path_dir_length(c.path), c.dir_len) << c.path;
+    }
+}
+
+TEST(Paths, HostPathMapsBackslashesAndRefusesOverlongPaths) {
+    char out[16];
+    ASSERT_TRUE(host_path("a\\b\\c.tga", out, sizeof out));
+#if defined(_WIN32)
+    EXPECT_STREQ(out, "a\\b\\c.tga");
+#else
+    EXPECT_STREQ(out, "a/b/c.tga");
+#endif
+    EXPECT_FALSE(host_path("0123456789abcdef", out, sizeof out)); // 16 + NUL does not fit
+    EXPECT_EQ(open_host_file(std::string(2000, 'x').c_str(), "rb"), nullptr);
+}
+
+} // namespace
