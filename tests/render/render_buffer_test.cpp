@@ -57,8 +57,8 @@ TEST(RenderBuffer, FillWordsLeavesTheRemainderBytes) {
         vrx::render::FillWords(buf.data(), 0x11223344, bytes);
         for (uint32_t i = 0; i < buf.size(); ++i) {
             // Little-endian words: bytes 44 33 22 11 repeat over the whole words only.
-            unsigned char want =
-                i < bytes / 4 * 4 ? static_cast<unsigned char>(0x11223344u >> (8 * (i % 4))) : 0xAA;
+            auto want = static_cast<unsigned char>(
+                i < bytes / 4 * 4 ? (0x11223344u >> (8 * (i % 4))) & 0xFFu : 0xAAu);
             ASSERT_EQ(buf[i], want) << bytes << " at " << i;
         }
     }
