@@ -27,17 +27,41 @@ namespace eng = vrx::engine;
 
 extern "C" {
 
-VRX_API int32_t EGL_Sqrt(int32_t x) noexcept { return eng::Sqrt(x); }
-VRX_API int32_t EGL_InvSqrt(int32_t x) noexcept { return eng::InvSqrt(x); }
-VRX_API int32_t EGL_Inverse(int32_t x) noexcept { return eng::Inverse(x); }
-VRX_API int32_t EGL_hInverse(int32_t x) noexcept { return eng::hInverse(x); }
-VRX_API int32_t EGL_Div(int32_t a, int32_t b) noexcept { return eng::Div(a, b); }
-VRX_API int32_t EGL_Sin(int32_t angle) noexcept { return eng::Sin(angle); }
-VRX_API int32_t EGL_Cos(int32_t angle) noexcept { return eng::Cos(angle); }
-VRX_API int32_t F_MIN(int32_t a, int32_t b) noexcept { return eng::f_min(a, b); }
-VRX_API int32_t F_MAX(int32_t a, int32_t b) noexcept { return eng::f_max(a, b); }
-VRX_API int32_t I_MIN(int32_t a, int32_t b) noexcept { return eng::f_min(a, b); }
-VRX_API int32_t I_MAX(int32_t a, int32_t b) noexcept { return eng::f_max(a, b); }
-VRX_API int32_t I_RND(int32_t x) noexcept { return eng::i_rnd(x); }
+VRX_API int32_t EGL_Sqrt(int32_t x) noexcept {
+    return eng::Sqrt(x);
+}
+VRX_API int32_t EGL_InvSqrt(int32_t x) noexcept {
+    return eng::InvSqrt(x);
+}
+VRX_API int32_t EGL_Inverse(int32_t x) noexcept {
+    return eng::Inverse(x);
+}
+VRX_API int32_t EGL_hInverse(int32_t x) noexcept {
+    return eng::hInverse(x);
+}
+VRX_API int32_t EGL_Div(int32_t a, int32_t b) noexcept {
+    return eng::Div(a, b);
+}
+VRX_API int32_t EGL_Sin(int32_t angle) noexcept {
+    return eng::Sin(angle);
+}
+VRX_API int32_t EGL_Cos(int32_t angle) noexcept {
+    return eng::Cos(angle);
+}
+VRX_API int32_t F_MIN(int32_t a, int32_t b) noexcept {
+    return eng::f_min(a, b);
+}
+VRX_API int32_t F_MAX(int32_t a, int32_t b) noexcept {
+    return eng::f_max(a, b);
+}
+VRX_API int32_t I_MIN(int32_t a, int32_t b) noexcept {
+    return eng::f_min(a, b);
+}
+VRX_API int32_t I_MAX(int32_t a, int32_t b) noexcept {
+    return eng::f_max(a, b);
+}
+VRX_API int32_t I_RND(int32_t x) noexcept {
+    return eng::i_rnd(x);
+}
 
 } // extern "C"

@@ -46,14 +46,20 @@ constexpr uint32_t magnitude(int32_t a) {
 
 // (a * b) >> 16 on the full 64-bit product, low 32 bits kept. Operands may be up to 2^31 in
 // magnitude (the reciprocal routines multiply by the unsigned magnitude of their argument).
-constexpr int32_t mul_shift16(int64_t a, int64_t b) { return static_cast<int32_t>((a * b) >> 16); }
+constexpr int32_t mul_shift16(int64_t a, int64_t b) {
+    return static_cast<int32_t>((a * b) >> 16);
+}
 
 // Fixed-point product: signed 64-bit product, arithmetic shift right by 16, low 32 bits kept.
 // No rounding, no saturation.
-constexpr int32_t f_mul(int32_t a, int32_t b) { return mul_shift16(a, b); }
+constexpr int32_t f_mul(int32_t a, int32_t b) {
+    return mul_shift16(a, b);
+}
 
 // The engine's traditional name for f_mul.
-constexpr int32_t F_MUL(int32_t a, int32_t b) { return f_mul(a, b); }
+constexpr int32_t F_MUL(int32_t a, int32_t b) {
+    return f_mul(a, b);
+}
 
 // Sum of three 64-bit products, accumulated modulo 2^64 (three products of INT32_MIN squared
 // would overflow a signed sum), then shifted right by 16 once and cut to 32 bits.
@@ -75,9 +81,8 @@ constexpr int32_t cross_shift16(int32_t a0, int32_t b0, int32_t a1, int32_t b1) 
 // ---- Constant tables ---------------------------------------------------------------------------
 
 // Seeds of the reciprocal: entry k is floor(2^30 / (8 + k)).
-inline constexpr std::array<int32_t, 8> InverseSeed = {0x8000000, 0x71C71C7, 0x6666666,
-                                                       0x5D1745D, 0x5555555, 0x4EC4EC4,
-                                                       0x4924924, 0x4444444};
+inline constexpr std::array<int32_t, 8> InverseSeed = {0x8000000, 0x71C71C7, 0x6666666, 0x5D1745D,
+                                                       0x5555555, 0x4EC4EC4, 0x4924924, 0x4444444};
 
 // Seeds of the inverse square root: entry k is floor(2^17 / sqrt(8 + k)).
 inline constexpr std::array<uint16_t, 8> InvSqrtSeed = {0xB504, 0xAAAA, 0xA1E8, 0x9A5F,
@@ -313,7 +318,9 @@ constexpr int32_t InvSqrt(int32_t x) {
 }
 
 // sqrt(x) as FIXED through 1 / (1 / sqrt(x)); 0 for x <= 0.
-constexpr int32_t Sqrt(int32_t x) { return x <= 0 ? 0 : Inverse(InvSqrt(x)); }
+constexpr int32_t Sqrt(int32_t x) {
+    return x <= 0 ? 0 : Inverse(InvSqrt(x));
+}
 
 // ---- Sine and cosine ---------------------------------------------------------------------------
 
@@ -343,7 +350,9 @@ constexpr int32_t sin_of_phase(int32_t phase) {
 }
 
 // sin(angle) for an angle in radians as FIXED; the result lies in -65534..65534.
-constexpr int32_t Sin(int32_t angle) { return sin_of_phase(angle_phase(angle) >> 20); }
+constexpr int32_t Sin(int32_t angle) {
+    return sin_of_phase(angle_phase(angle) >> 20);
+}
 
 // cos(angle): the sine phase advanced by a quarter turn (0x4000 in 16-bit phase units).
 constexpr int32_t Cos(int32_t angle) {
@@ -359,10 +368,14 @@ constexpr int32_t deg_to_rad(int32_t degrees) {
 // ---- Minimum, maximum, clamp, rounding ---------------------------------------------------------
 
 // The smaller of a and b (signed); FIXED and integers compare alike.
-constexpr int32_t f_min(int32_t a, int32_t b) { return a < b ? a : b; }
+constexpr int32_t f_min(int32_t a, int32_t b) {
+    return a < b ? a : b;
+}
 
 // The larger of a and b (signed).
-constexpr int32_t f_max(int32_t a, int32_t b) { return a > b ? a : b; }
+constexpr int32_t f_max(int32_t a, int32_t b) {
+    return a > b ? a : b;
+}
 
 // low if v < low, else high if v > high, else v.
 constexpr int32_t f_clamp(int32_t v, int32_t low, int32_t high) {
@@ -370,6 +383,8 @@ constexpr int32_t f_clamp(int32_t v, int32_t low, int32_t high) {
 }
 
 // Nearest integer of a FIXED value, halves upward: (x + 0.5) >> 16, the sum wrapping in 32 bits.
-constexpr int32_t i_rnd(int32_t x) { return wrap_add(x, 0x8000) >> 16; }
+constexpr int32_t i_rnd(int32_t x) {
+    return wrap_add(x, 0x8000) >> 16;
+}
 
 } // namespace vrx::engine

@@ -40,8 +40,8 @@ FIXED vec_inv_len(const VECTOR& v) {
 void vec_normalize(VECTOR& v) {
     // Bring the largest magnitude below 16.0 (at least 12 leading zeros) so the three squares
     // sum below 768.0 and cannot overflow the 32-bit sum of vec_inv_len.
-    const int32_t n = std::min({lead_zeros(magnitude(v.x)), lead_zeros(magnitude(v.y)),
-                                lead_zeros(magnitude(v.z))});
+    const int32_t n = std::min(
+        {lead_zeros(magnitude(v.x)), lead_zeros(magnitude(v.y)), lead_zeros(magnitude(v.z))});
     if (n < 12) {
         const int32_t shift = 12 - n;
         v.x >>= shift;
@@ -204,15 +204,27 @@ VRX_API void Vpp(const VECTOR* a, const VECTOR* b, VECTOR* out) noexcept {
 VRX_API void Vmm(const VECTOR* a, const VECTOR* b, VECTOR* out) noexcept {
     eng::vec_sub(*a, *b, *out);
 }
-VRX_API void Vxx(FIXED s, VECTOR* v) noexcept { eng::vec_scale(s, *v); }
-VRX_API FIXED Vdot(const VECTOR* a, const VECTOR* b) noexcept { return eng::vec_dot(*a, *b); }
+VRX_API void Vxx(FIXED s, VECTOR* v) noexcept {
+    eng::vec_scale(s, *v);
+}
+VRX_API FIXED Vdot(const VECTOR* a, const VECTOR* b) noexcept {
+    return eng::vec_dot(*a, *b);
+}
 VRX_API void Vcross(const VECTOR* a, const VECTOR* b, VECTOR* out) noexcept {
     eng::vec_cross(*a, *b, *out);
 }
-VRX_API FIXED Vlen(const VECTOR* v) noexcept { return eng::vec_len(*v); }
-VRX_API FIXED invVlen(const VECTOR* v) noexcept { return eng::vec_inv_len(*v); }
-VRX_API void vrxNormalize(VECTOR* v) noexcept { eng::vec_normalize(*v); }
-VRX_API void sim_normalize(VECTOR* v) noexcept { eng::vec_normalize(*v); }
+VRX_API FIXED Vlen(const VECTOR* v) noexcept {
+    return eng::vec_len(*v);
+}
+VRX_API FIXED invVlen(const VECTOR* v) noexcept {
+    return eng::vec_inv_len(*v);
+}
+VRX_API void vrxNormalize(VECTOR* v) noexcept {
+    eng::vec_normalize(*v);
+}
+VRX_API void sim_normalize(VECTOR* v) noexcept {
+    eng::vec_normalize(*v);
+}
 
 VRX_API void V2pp(const VECTOR2* a, const VECTOR2* b, VECTOR2* out) noexcept {
     eng::vec2_add(*a, *b, *out);
@@ -220,13 +232,25 @@ VRX_API void V2pp(const VECTOR2* a, const VECTOR2* b, VECTOR2* out) noexcept {
 VRX_API void V2mm(const VECTOR2* a, const VECTOR2* b, VECTOR2* out) noexcept {
     eng::vec2_sub(*a, *b, *out);
 }
-VRX_API void V2xx(FIXED s, VECTOR2* v) noexcept { eng::vec2_scale(s, *v); }
-VRX_API FIXED V2dot(const VECTOR2* a, const VECTOR2* b) noexcept { return eng::vec2_dot(*a, *b); }
-VRX_API void V2norm(VECTOR2* v) noexcept { eng::vec2_norm(*v); }
+VRX_API void V2xx(FIXED s, VECTOR2* v) noexcept {
+    eng::vec2_scale(s, *v);
+}
+VRX_API FIXED V2dot(const VECTOR2* a, const VECTOR2* b) noexcept {
+    return eng::vec2_dot(*a, *b);
+}
+VRX_API void V2norm(VECTOR2* v) noexcept {
+    eng::vec2_norm(*v);
+}
 
-VRX_API void IdentityX(VECTOR* v) noexcept { eng::vec_identity_x(*v); }
-VRX_API void IdentityY(VECTOR* v) noexcept { eng::vec_identity_y(*v); }
-VRX_API void IdentityZ(VECTOR* v) noexcept { eng::vec_identity_z(*v); }
+VRX_API void IdentityX(VECTOR* v) noexcept {
+    eng::vec_identity_x(*v);
+}
+VRX_API void IdentityY(VECTOR* v) noexcept {
+    eng::vec_identity_y(*v);
+}
+VRX_API void IdentityZ(VECTOR* v) noexcept {
+    eng::vec_identity_z(*v);
+}
 
 VRX_API void GlobalUCS(const UCS* local, const UCS* parent, UCS* out) noexcept {
     eng::ucs_to_global(*local, *parent, *out);

@@ -61,9 +61,15 @@ FIXED vec_inv_len(const VECTOR& v);
 void vec_normalize(VECTOR& v);
 
 // v = (1, 0, 0), (0, 1, 0), (0, 0, 1).
-constexpr void vec_identity_x(VECTOR& v) { v = VECTOR{0x10000, 0, 0}; }
-constexpr void vec_identity_y(VECTOR& v) { v = VECTOR{0, 0x10000, 0}; }
-constexpr void vec_identity_z(VECTOR& v) { v = VECTOR{0, 0, 0x10000}; }
+constexpr void vec_identity_x(VECTOR& v) {
+    v = VECTOR{0x10000, 0, 0};
+}
+constexpr void vec_identity_y(VECTOR& v) {
+    v = VECTOR{0, 0x10000, 0};
+}
+constexpr void vec_identity_z(VECTOR& v) {
+    v = VECTOR{0, 0, 0x10000};
+}
 
 // ---- Two-component vectors ---------------------------------------------------------------------
 
