@@ -12,6 +12,7 @@
 #include "lite_vrx.h"
 #include "render/render_buffer.h"
 #include "render/window.h"
+#include "scene/material.h"
 
 namespace vrx::engine {
 
@@ -26,6 +27,7 @@ struct ClearStep {
 
 // In the order records must go: users before what they use, worlds last.
 constexpr ClearStep kClearSteps[] = {
+    {scene::clear_materials, "Clear materials failed in ClearAllObjects!!\n"},
     {render::clear_windows, "Clear windows failed in ClearAllObjects!!\n"},
 };
 

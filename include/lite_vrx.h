@@ -225,6 +225,65 @@ VRX_API int32_t VRX_SwapRenderBuffer(void) VRX_NOEXCEPT;
 
 /* ---- Materials ----------------------------------------------------------------- */
 
+/* Material settings as the host passes and reads them. Colours are bytes r, g, b, a
+ * (255 is 1.0); the multipliers and self-illumination are FIXED. */
+typedef struct MATINFO {
+    void* texture;         /* bound texture handle, or null */
+    uint8_t ambient[4];    /* ambient r, g, b, a */
+    uint8_t diffuse[4];    /* diffuse r, g, b, a; a is the opacity */
+    FIXED ambient_scale;   /* ambient multiplier */
+    FIXED diffuse_scale;   /* diffuse multiplier */
+    FIXED self_illum;      /* 0 to 1.0; 1.0 draws the diffuse colour unlit */
+    uint32_t flags;        /* VRX_MAT_* bits, shading mode in VRX_MAT_SHADING */
+} MATINFO;
+
+/* Bits of MATINFO.flags. */
+enum {
+    VRX_MAT_TWO_SIDED = 1,  /* faces drawn from both sides */
+    VRX_MAT_REFLECT = 2,    /* texture coordinates by reflection mapping */
+    VRX_MAT_UNTEXTURED = 4, /* drawn untextured even with a texture bound */
+    VRX_MAT_SHADING = 0x38  /* shading mode times 8 */
+};
+
+/* Makes an unnamed material from info (one use) and stores its handle through out. */
+VRX_API int32_t VRX_CreateMaterial(const MATINFO* info, void** out) VRX_NOEXCEPT;
+/* Copies a material (name included) into a new one with one use. */
+VRX_API int32_t VRX_DuplicateMaterial(void* mat, void** out) VRX_NOEXCEPT;
+/* Releases one use of a material; the last use frees it. */
+VRX_API int32_t VRX_DeleteMaterial(void* mat) VRX_NOEXCEPT;
+/* Records the engine's default material. */
+VRX_API int32_t VRX_SetDefaultMaterial(void* mat) VRX_NOEXCEPT;
+/* Finds a named material, ignoring ASCII case; returns 1 with out null when none matches. */
+VRX_API int32_t VRX_GetMaterialByName(const char* name, void** out) VRX_NOEXCEPT;
+/* Copies the name (at most 24 characters; empty when unnamed) into buf, 25 bytes. */
+VRX_API int32_t VRX_GetMaterialName(void* mat, char* buf) VRX_NOEXCEPT;
+/* Sets the ambient (which 0) or diffuse (otherwise) colour from 4 bytes r, g, b, a. */
+VRX_API int32_t VRX_SetMaterialColor(void* mat, const uint8_t* rgba, int32_t which) VRX_NOEXCEPT;
+/* Reads the ambient (which 0) or diffuse colour as 4 bytes. */
+VRX_API int32_t VRX_GetMaterialColor(void* mat, uint8_t* rgba, int32_t which) VRX_NOEXCEPT;
+/* Sets the ambient (which 0) or diffuse multiplier. */
+VRX_API int32_t VRX_SetMaterialColorScale(void* mat, FIXED scale, int32_t which) VRX_NOEXCEPT;
+/* Reads the ambient (which 0) or diffuse multiplier. */
+VRX_API int32_t VRX_GetMaterialColorScale(void* mat, FIXED* scale, int32_t which) VRX_NOEXCEPT;
+/* Sets the self-illumination, clamped to 0..1.0. */
+VRX_API int32_t VRX_SetMaterialSelfIllum(void* mat, FIXED value) VRX_NOEXCEPT;
+/* Reads the self-illumination. */
+VRX_API int32_t VRX_GetMaterialSelfIllum(void* mat, FIXED* value) VRX_NOEXCEPT;
+/* Draws faces from both sides when two_sided is not 0. */
+VRX_API int32_t VRX_SetMaterialSide(void* mat, int32_t two_sided) VRX_NOEXCEPT;
+/* Sets the shading mode 0 to 3; any other mode keeps the current one. */
+VRX_API int32_t VRX_SetMaterialShading(void* mat, int32_t mode) VRX_NOEXCEPT;
+/* Reads texture, colours, multipliers, self-illumination and flags. */
+VRX_API int32_t VRX_GetMaterialInfo(void* mat, MATINFO* info) VRX_NOEXCEPT;
+/* Replaces texture, colours, multipliers, self-illumination and flags. */
+VRX_API int32_t VRX_SetMaterialInfo(void* mat, const MATINFO* info) VRX_NOEXCEPT;
+/* Stores the bound texture (or null) through out. */
+VRX_API int32_t VRX_GetMaterialTexture(void* mat, void** out) VRX_NOEXCEPT;
+/* Binds a texture to a material. */
+VRX_API int32_t VRX_BindMaterialTexture(void* mat, void* tex) VRX_NOEXCEPT;
+/* Sets the texture scroll offsets (1.0 is the texture's size). */
+VRX_API int32_t VRX_MoveMaterialTexture(void* mat, FIXED u, FIXED v) VRX_NOEXCEPT;
+
 /* ---- Resource packs ------------------------------------------------------------ */
 
 /* ---- Textures ------------------------------------------------------------------ */
