@@ -12,7 +12,9 @@
 #include "lite_vrx.h"
 #include "render/render_buffer.h"
 #include "render/window.h"
+#include "scene/camera.h"
 #include "scene/material.h"
+#include "scene/world.h"
 
 namespace vrx::engine {
 
@@ -28,7 +30,10 @@ struct ClearStep {
 // In the order records must go: users before what they use, worlds last.
 constexpr ClearStep kClearSteps[] = {
     {scene::clear_materials, "Clear materials failed in ClearAllObjects!!\n"},
+    {scene::clear_cameras, "Clear cameras failed in ClearAllObjects!!\n"},
     {render::clear_windows, "Clear windows failed in ClearAllObjects!!\n"},
+    // Worlds last; this step cannot fail, so its message is never reported.
+    {scene::clear_worlds, "Clear worlds failed in ClearAllObjects!!\n"},
 };
 
 void release_buffers() noexcept {

@@ -221,7 +221,95 @@ VRX_API int32_t VRX_SwapRenderBuffer(void) VRX_NOEXCEPT;
 
 /* ---- Worlds -------------------------------------------------------------------- */
 
+/* Makes a world (bit 0 of visible set: drawn) and stores its handle through out. */
+VRX_API int32_t VRX_NewWorld(uint32_t visible, void** out) VRX_NOEXCEPT;
+/* Deletes a world with its objects, omni lights and billboards. */
+VRX_API int32_t VRX_DeleteWorld(void* world) VRX_NOEXCEPT;
+/* Sets a world's visibility word (bit 0: drawn by the render calls). */
+VRX_API int32_t VRX_SetWorldVisibility(void* world, uint32_t visible) VRX_NOEXCEPT;
+
 /* ---- Cameras ------------------------------------------------------------------- */
+
+/* Set-up of a new or reset camera; fov in degrees. */
+typedef struct CAMSETUP {
+    VECTOR eye;
+    VECTOR at; /* target */
+    FIXED fov;
+    FIXED near_clip;
+    FIXED far_clip;
+} CAMSETUP;
+
+/* Everything a camera shows the host: eye, frame, target, fov (degrees) and clips. */
+typedef struct CAMINFO {
+    VECTOR eye;
+    VECTOR x_axis; /* right */
+    VECTOR y_axis; /* up */
+    VECTOR z_axis; /* viewing direction */
+    VECTOR at;     /* target */
+    FIXED fov;
+    FIXED near_clip;
+    FIXED far_clip;
+} CAMINFO;
+
+/* Makes a camera looking from eye at the target; near must be below far. */
+VRX_API int32_t VRX_NewCamera(const CAMSETUP* setup, void** out) VRX_NOEXCEPT;
+/* Names the camera the render calls use when given none. */
+VRX_API int32_t VRX_SetDefaultCam(void* camera) VRX_NOEXCEPT;
+/* Stores the default camera (null when there is none) through out. */
+VRX_API int32_t VRX_GetDefaultCam(void** out) VRX_NOEXCEPT;
+/* Finds a named camera, ignoring ASCII case; returns 1 with out null when none matches. */
+VRX_API int32_t VRX_GetCameraByName(const char* name, void** out) VRX_NOEXCEPT;
+/* Deletes a camera. */
+VRX_API int32_t VRX_DeleteCamera(void* camera) VRX_NOEXCEPT;
+/* Deletes every camera. */
+VRX_API int32_t VRX_DeleteAllCameras(void) VRX_NOEXCEPT;
+/* Moves eye and target: mode 0 by v in camera axes, 1 by v in world axes, 2 eye to v. */
+VRX_API int32_t VRX_MoveCamera(void* camera, const VECTOR* v, int32_t mode) VRX_NOEXCEPT;
+/* Turns the target about the eye, left and right (degrees). */
+VRX_API int32_t VRX_PanCamera(void* camera, FIXED degrees) VRX_NOEXCEPT;
+/* Turns the target about the eye, up and down (degrees). */
+VRX_API int32_t VRX_TiltCamera(void* camera, FIXED degrees) VRX_NOEXCEPT;
+/* Turns the camera about its viewing direction (degrees). */
+VRX_API int32_t VRX_RollCamera(void* camera, FIXED degrees) VRX_NOEXCEPT;
+/* Looks at a new target from the same eye. */
+VRX_API int32_t VRX_PanCameraTo(void* camera, const VECTOR* point) VRX_NOEXCEPT;
+/* Orbits the eye about the target in camera axes: a1 sideways, a2 up and down (degrees). */
+VRX_API int32_t VRX_ArcCamera(void* camera, FIXED a1, FIXED a2) VRX_NOEXCEPT;
+/* Orbits the eye about the target in world axes: a1 about the vertical, a2 in elevation. */
+VRX_API int32_t VRX_GlobalArcCamera(void* camera, FIXED a1, FIXED a2) VRX_NOEXCEPT;
+/* Sets the field of view in degrees (kept between 16 raw units and 175 degrees). */
+VRX_API int32_t VRX_SetCameraFOV(void* camera, FIXED degrees) VRX_NOEXCEPT;
+/* Moves eye and target along the camera's X axis. */
+VRX_API int32_t VRX_TruckCamera(void* camera, FIXED distance) VRX_NOEXCEPT;
+/* Moves eye and target along the camera's Y axis. */
+VRX_API int32_t VRX_LiftCamera(void* camera, FIXED distance) VRX_NOEXCEPT;
+/* Moves eye and target along the camera's Z axis. */
+VRX_API int32_t VRX_DollyCamera(void* camera, FIXED distance) VRX_NOEXCEPT;
+/* Replaces eye, target, fov and clips (the clips are not checked). */
+VRX_API int32_t VRX_ResetCamera(void* camera, const CAMSETUP* setup) VRX_NOEXCEPT;
+/* Replaces everything; the given axes only start the rebuild of the frame. */
+VRX_API int32_t VRX_SetCameraInfo(void* camera, const CAMINFO* info) VRX_NOEXCEPT;
+/* Reads eye, frame, target, fov and clips. */
+VRX_API int32_t VRX_GetCameraInfo(void* camera, CAMINFO* info) VRX_NOEXCEPT;
+/* Moves the eye; the camera keeps looking at its target. */
+VRX_API int32_t VRX_SetCameraPos(void* camera, const VECTOR* eye) VRX_NOEXCEPT;
+/* Reads the eye. */
+VRX_API int32_t VRX_GetCameraPos(void* camera, VECTOR* eye) VRX_NOEXCEPT;
+/* Moves the target; the eye stays. */
+VRX_API int32_t VRX_SetCameraAt(void* camera, const VECTOR* at) VRX_NOEXCEPT;
+/* Reads the target. */
+VRX_API int32_t VRX_GetCameraAt(void* camera, VECTOR* at) VRX_NOEXCEPT;
+/* Sets the near clip distance (not checked against the far one). */
+VRX_API int32_t VRX_SetCameraNearClip(void* camera, FIXED distance) VRX_NOEXCEPT;
+/* Reads the near clip distance. */
+VRX_API int32_t VRX_GetCameraNearClip(void* camera, FIXED* distance) VRX_NOEXCEPT;
+/* Sets the far clip distance. */
+VRX_API int32_t VRX_SetCameraFarClip(void* camera, FIXED distance) VRX_NOEXCEPT;
+/* Reads the far clip distance. */
+VRX_API int32_t VRX_GetCameraFarClip(void* camera, FIXED* distance) VRX_NOEXCEPT;
+/* Unit world direction from the eye through screen point (sx, sy) of the current window. */
+VRX_API int32_t VRX_GetShootingVector(void* camera, int32_t sx, int32_t sy,
+                                      VECTOR* out) VRX_NOEXCEPT;
 
 /* ---- Materials ----------------------------------------------------------------- */
 
