@@ -3,6 +3,7 @@
 
 #include <cstring>
 
+#include "assets/texture.h"
 #include "engine/alloc.h"
 #include "engine/console.h"
 #include "engine/error.h"
@@ -29,6 +30,7 @@ struct ClearStep {
 
 // In the order records must go: users before what they use, worlds last.
 constexpr ClearStep kClearSteps[] = {
+    {assets::ClearTextures, "Clear textures failed in ClearAllObjects!!\n"},
     {scene::clear_materials, "Clear materials failed in ClearAllObjects!!\n"},
     {scene::clear_cameras, "Clear cameras failed in ClearAllObjects!!\n"},
     {render::clear_windows, "Clear windows failed in ClearAllObjects!!\n"},

@@ -374,7 +374,25 @@ VRX_API int32_t VRX_MoveMaterialTexture(void* mat, FIXED u, FIXED v) VRX_NOEXCEP
 
 /* ---- Resource packs ------------------------------------------------------------ */
 
+/* Selects a resource pack image in host memory (null deselects); the host keeps it alive. */
+VRX_API int32_t VRX_SelectResourceBuffer(const void* pack) VRX_NOEXCEPT;
+/* Selects a resource pack file (null deselects); -1 keeps the previous selection. */
+VRX_API int32_t VRX_SelectResourceFile(const char* path) VRX_NOEXCEPT;
+
 /* ---- Textures ------------------------------------------------------------------ */
+
+/* Finds the texture called name or loads it from the data path; one more reference. */
+VRX_API int32_t VRX_LoadTexture(const char* name, void** out) VRX_NOEXCEPT;
+/* Makes a texture from a copy of width x height pixels in format (VRX_FMT_*). */
+VRX_API int32_t VRX_LoadTextureFromMemory(int32_t width, int32_t height, const void* pixels,
+                                          uint32_t format, void** out) VRX_NOEXCEPT;
+/* Replaces a texture's pixels, resampling them when their size differs. */
+VRX_API int32_t VRX_UpdateTextureData(void* tex, int32_t width, int32_t height,
+                                      const void* pixels, uint32_t format) VRX_NOEXCEPT;
+/* Drops one reference; the last one releases the texture. */
+VRX_API int32_t VRX_UnloadTexture(void* tex) VRX_NOEXCEPT;
+/* Stores the texture's (power-of-two) width and height. */
+VRX_API int32_t VRX_GetTextureInfo(void* tex, int32_t* width, int32_t* height) VRX_NOEXCEPT;
 
 #ifdef __cplusplus
 }
