@@ -2,6 +2,9 @@
 // step of ClearAllObjects. The exported operations are at the bottom.
 #include "scene/world.h"
 
+#include <cstddef>
+#include <type_traits>
+
 #include "engine/error.h"
 #include "engine/fixed.h"
 #include "engine/state.h"
