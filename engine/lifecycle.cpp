@@ -11,6 +11,7 @@
 #include "engine/handles.h"
 #include "engine/state.h"
 #include "lite_vrx.h"
+#include "render/raster.h"
 #include "render/render_buffer.h"
 #include "render/window.h"
 #include "scene/camera.h"
@@ -134,6 +135,8 @@ VRX_API int32_t VRX_Open(uint32_t reserved, uint32_t width, uint32_t height,
         g_eng.eng_flags = FLAG_ZBUFFER;
         return -1;
     }
+    // The rasteriser starts with the standard (unfiltered) span fillers.
+    vrx::render::build_span_table(vrx::render::kSpanSetStandard);
     g_eng.is_open = 1;
     return 0;
 }

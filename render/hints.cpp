@@ -4,6 +4,7 @@
 #include "engine/error.h"
 #include "engine/state.h"
 #include "lite_vrx.h"
+#include "render/raster.h"
 #include "render/render_buffer.h"
 
 using namespace vrx;
@@ -49,7 +50,14 @@ VRX_API int32_t VRX_Hint(int32_t hint, uint32_t value) noexcept {
                           : (flags & ~engine::FLAG_SORT);
             return 0;
         case HINT_FILTERED:
-            flags = value == 1 ? (flags | engine::FLAG_FILTER) : (flags & ~engine::FLAG_FILTER);
+            // Only the value 1 selects the filtered fillers; the table follows the flag.
+            if (value == 1) {
+                flags |= engine::FLAG_FILTER;
+                render::build_span_table(render::kSpanSetFiltered);
+            } else {
+                flags &= ~engine::FLAG_FILTER;
+                render::build_span_table(render::kSpanSetStandard);
+            }
             return 0;
         default:
             return -1;
