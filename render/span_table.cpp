@@ -71,14 +71,6 @@ constexpr bool slots_in_order() {
 }
 static_assert(slots_in_order(), "one row per SpanTable slot, in slot order");
 
-// 43 standard fillers and 30 filtered ones fill the slots.
-constexpr int filtered_rows() {
-    int count = 0;
-    for (const SlotFillers& row : kSlotFillers) count += row.filtered != nullptr ? 1 : 0;
-    return count;
-}
-static_assert(filtered_rows() == 30);
-
 } // namespace
 
 void build_span_table(int32_t set) noexcept {
