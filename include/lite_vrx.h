@@ -316,13 +316,13 @@ VRX_API int32_t VRX_GetShootingVector(void* camera, int32_t sx, int32_t sy,
 /* Material settings as the host passes and reads them. Colours are bytes r, g, b, a
  * (255 is 1.0); the multipliers and self-illumination are FIXED. */
 typedef struct MATINFO {
-    void* texture;         /* bound texture handle, or null */
-    uint8_t ambient[4];    /* ambient r, g, b, a */
-    uint8_t diffuse[4];    /* diffuse r, g, b, a; a is the opacity */
-    FIXED ambient_scale;   /* ambient multiplier */
-    FIXED diffuse_scale;   /* diffuse multiplier */
-    FIXED self_illum;      /* 0 to 1.0; 1.0 draws the diffuse colour unlit */
-    uint32_t flags;        /* VRX_MAT_* bits, shading mode in VRX_MAT_SHADING */
+    void* texture;       /* bound texture handle, or null */
+    uint8_t ambient[4];  /* ambient r, g, b, a */
+    uint8_t diffuse[4];  /* diffuse r, g, b, a; a is the opacity */
+    FIXED ambient_scale; /* ambient multiplier */
+    FIXED diffuse_scale; /* diffuse multiplier */
+    FIXED self_illum;    /* 0 to 1.0; 1.0 draws the diffuse colour unlit */
+    uint32_t flags;      /* VRX_MAT_* bits, shading mode in VRX_MAT_SHADING */
 } MATINFO;
 
 /* Bits of MATINFO.flags. */
@@ -387,8 +387,8 @@ VRX_API int32_t VRX_LoadTexture(const char* name, void** out) VRX_NOEXCEPT;
 VRX_API int32_t VRX_LoadTextureFromMemory(int32_t width, int32_t height, const void* pixels,
                                           uint32_t format, void** out) VRX_NOEXCEPT;
 /* Replaces a texture's pixels, resampling them when their size differs. */
-VRX_API int32_t VRX_UpdateTextureData(void* tex, int32_t width, int32_t height,
-                                      const void* pixels, uint32_t format) VRX_NOEXCEPT;
+VRX_API int32_t VRX_UpdateTextureData(void* tex, int32_t width, int32_t height, const void* pixels,
+                                      uint32_t format) VRX_NOEXCEPT;
 /* Drops one reference; the last one releases the texture. */
 VRX_API int32_t VRX_UnloadTexture(void* tex) VRX_NOEXCEPT;
 /* Stores the texture's (power-of-two) width and height. */
