@@ -27,6 +27,11 @@ constexpr int32_t wrap_sub(int32_t a, int32_t b) {
     return static_cast<int32_t>(static_cast<uint32_t>(a) - static_cast<uint32_t>(b));
 }
 
+// a * b modulo 2^32 (the low word of the product).
+constexpr int32_t wrap_mul(int32_t a, int32_t b) {
+    return static_cast<int32_t>(static_cast<uint32_t>(a) * static_cast<uint32_t>(b));
+}
+
 // -a modulo 2^32 (INT32_MIN stays INT32_MIN).
 constexpr int32_t wrap_neg(int32_t a) {
     return static_cast<int32_t>(0u - static_cast<uint32_t>(a));

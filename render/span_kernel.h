@@ -27,16 +27,12 @@
 namespace vrx::render::span {
 
 using engine::wrap_add;
+using engine::wrap_mul;
 using engine::wrap_sub;
 
 // (a * b) >> s on the 64-bit product, low 32 bits kept.
 VRX_SPAN_INLINE constexpr int32_t mul_shr(int32_t a, int32_t b, int32_t s) {
     return static_cast<int32_t>((int64_t{a} * b) >> s);
-}
-
-// a * b modulo 2^32: the colour operations' 32-bit products.
-VRX_SPAN_INLINE constexpr int32_t mul_wrap(int32_t a, int32_t b) {
-    return static_cast<int32_t>(static_cast<uint32_t>(a) * static_cast<uint32_t>(b));
 }
 
 // RecipTable entry for a pixel count. Spans longer than the table (only possible when a zoomed
@@ -82,7 +78,7 @@ VRX_SPAN_INLINE Taps base_taps(const TexView& t) {
 VRX_SPAN_INLINE Taps footprint(const Taps& base, const TexView& t, int32_t du, int32_t dv) {
     const int32_t eu = du >> (t.ushift - 3);
     const int32_t ev = dv >> (t.vshift - 3);
-    const int32_t q = wrap_add(mul_wrap(eu, eu), mul_wrap(ev, ev));
+    const int32_t q = wrap_add(wrap_mul(eu, eu), wrap_mul(ev, ev));
     int32_t grow = 0;
     if (q > 512) ++grow;
     if (q > 1024) ++grow;
@@ -121,9 +117,9 @@ VRX_SPAN_INLINE uint16_t pack_colour(int32_t r, int32_t g, int32_t b) {
 // RGB565 texel times a colour; a channel of 255.0 keeps 255/256 of the field.
 VRX_SPAN_INLINE uint16_t modulate(uint32_t t, int32_t r, int32_t g, int32_t b) {
     const auto ti = static_cast<int32_t>(t);
-    return static_cast<uint16_t>(((mul_wrap(ti >> 11, r) >> 13) & 0xF800) +
-                                 ((mul_wrap((ti >> 5) & 63, g) >> 19) & 0xFFE0) +
-                                 (mul_wrap(ti & 31, b) >> 24));
+    return static_cast<uint16_t>(((wrap_mul(ti >> 11, r) >> 13) & 0xF800) +
+                                 ((wrap_mul((ti >> 5) & 63, g) >> 19) & 0xFFE0) +
+                                 (wrap_mul(ti & 31, b) >> 24));
 }
 
 // RGB565 texel plus a colour, each channel saturating at 255.0. The texel's fields count as
@@ -144,9 +140,9 @@ VRX_SPAN_INLINE uint16_t blend(uint16_t p, int32_t rs, int32_t gs, int32_t bs, i
     const int32_t g8 = ((p >> 3) & 0xFC) | ((p >> 9) & 3);
     const int32_t b8 = ((p & 31) << 3) | ((p & 31) >> 2);
     const int32_t keep = 256 - a;
-    return static_cast<uint16_t>(((mul_wrap(r8, keep) + mul_wrap(rs, a)) & 0xF800) +
-                                 (((mul_wrap(g8, keep) + mul_wrap(gs, a)) >> 5) & 0xFFE0) +
-                                 ((mul_wrap(b8, keep) + mul_wrap(bs, a)) >> 11));
+    return static_cast<uint16_t>(((wrap_mul(r8, keep) + wrap_mul(rs, a)) & 0xF800) +
+                                 (((wrap_mul(g8, keep) + wrap_mul(gs, a)) >> 5) & 0xFFE0) +
+                                 ((wrap_mul(b8, keep) + wrap_mul(bs, a)) >> 11));
 }
 
 // A texel blended over p. Format 0 blends by the material weight A; the alpha formats blend by
@@ -159,11 +155,11 @@ VRX_SPAN_INLINE uint16_t blend_texel(uint16_t p, uint32_t t, int32_t a_material)
     } else if constexpr (Tx == Texel::Rgba4444) {
         const int32_t a = (ti & 15) * 17; // 4-bit alpha to 0..255
         return blend(p, (ti >> 8) & 0xF0, (ti >> 4) & 0xF0, ti & 0xF0,
-                     kScaleByA ? mul_wrap(a, a_material) >> 8 : a);
+                     kScaleByA ? wrap_mul(a, a_material) >> 8 : a);
     } else {
         const auto a = static_cast<int32_t>(t >> 24);
         return blend(p, (ti >> 16) & 255, (ti >> 8) & 255, ti & 255,
-                     kScaleByA ? mul_wrap(a, a_material) >> 8 : a);
+                     kScaleByA ? wrap_mul(a, a_material) >> 8 : a);
     }
 }
 
@@ -369,7 +365,7 @@ VRX_SPAN_INLINE void fill_span(const SPAN_EDGE& left, const SPAN_EDGE& right, in
         // Steps per 8 pixels from the first to the last pixel centre.
         const auto step8 = [&](int32_t edge, int32_t d, int32_t first) {
             const int32_t last = wrap_add(edge, mul_shr(s1, d, 16));
-            return mul_wrap(mul_shr(wrap_sub(last, first), recip_n, 24), 8);
+            return wrap_mul(mul_shr(wrap_sub(last, first), recip_n, 24), 8);
         };
         const int32_t dw8 = step8(left.w, dw, w);
         const int32_t duw8 = step8(left.uw, duw, uw);

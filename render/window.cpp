@@ -16,13 +16,8 @@ using engine::g_eng;
 
 namespace {
 
-// 32-bit wrap-around sum for the derived values, whose inputs the host keeps in range.
-constexpr int32_t wrap_add(int32_t a, int32_t b) noexcept {
-    return static_cast<int32_t>(static_cast<uint32_t>(a) + static_cast<uint32_t>(b));
-}
-constexpr int32_t wrap_mul(int32_t a, int32_t b) noexcept {
-    return static_cast<int32_t>(static_cast<uint32_t>(a) * static_cast<uint32_t>(b));
-}
+using engine::wrap_add;
+using engine::wrap_mul;
 
 // Projection values that follow the size, position and zoom.
 void recalc_projection(VPORT* w) noexcept {

@@ -50,7 +50,7 @@ void release_texture_ref(TEXTURE* t) noexcept {
     if (!live_texture(t)) return;
     if (t->ref_count > 0) --t->ref_count;
     if (t->ref_count == 0) {
-        g_eng.texture_list.unlink(t);
+        assets::UnlinkTexture(t);
         assets::FreeTexture(t);
     }
 }
