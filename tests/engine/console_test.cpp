@@ -1,6 +1,7 @@
 // ReportError, last_error and the on-screen console.
 #include <gtest/gtest.h>
 
+#include <array>
 #include <string>
 
 #include "engine/console.h"
@@ -33,31 +34,17 @@ class Console : public EngineTest {
 };
 
 TEST_F(Console, FontIsCodePage437) {
-    // 'A' has a crossbar and open bottom corners; the full block is all set; 0 is blank.
-    int a_bits = 0, block_bits = 0, blank_bits = 0;
-    for (int r = 0; r < 16; ++r)
-        for (int k = 0; k < 8; ++k) {
-            a_bits += glyph_bit('A', k, r);
-            block_bits += glyph_bit(0xDB, k, r);
-            blank_bits += glyph_bit(0, k, r) + glyph_bit(' ', k, r);
-        }
-    EXPECT_EQ(block_bits, 128);
-    EXPECT_EQ(blank_bits, 0);
-    EXPECT_GT(a_bits, 20);
-    // The smiley face (0x01) is not blank: the font covers the symbol range.
-    int face_bits = 0;
-    for (int r = 0; r < 16; ++r)
-        for (int k = 0; k < 8; ++k) face_bits += glyph_bit(1, k, r);
-    EXPECT_GT(face_bits, 20);
-}
-
-TEST_F(Console, GeometryAt240x320) {
-    const CONSOLE& c = g_eng.con;
-    EXPECT_EQ(c.con_cols, 30);
-    EXPECT_EQ(c.con_rows, 20);
-    EXPECT_EQ(c.con_cell_w, 8);
-    EXPECT_EQ(c.con_cell_h, 16);
-    EXPECT_EQ(c.con_color, 0xFFFF);
+    // The full block is all set, 0 and space are blank, 'A' and the smiley face (0x01) are drawn.
+    auto bits = [](int c) {
+        int n = 0;
+        for (int r = 0; r < 16; ++r)
+            for (int k = 0; k < 8; ++k) n += glyph_bit(c, k, r);
+        return n;
+    };
+    EXPECT_EQ(bits(0xDB), 128);
+    EXPECT_EQ(bits(0) + bits(' '), 0);
+    EXPECT_GT(bits('A'), 20);
+    EXPECT_GT(bits(1), 20);
 }
 
 TEST_F(Console, BackspaceMovesBackAndDrawsOver) {
@@ -90,37 +77,36 @@ TEST_F(Console, WrapsLinesAndRowsWithoutScrolling) {
 
 TEST_F(Console, ScaleIsClampedAndSizesFollow) {
     struct Case {
-        int sx, sy, want_x, want_y, cols, rows;
+        int sx, sy;
+        std::array<int32_t, 6> want; // scale x, y, cell w, h, columns, rows
     };
-    const Case cases[] = {
-        {0, 9, 1, 8, 30, 2}, {2, 2, 2, 2, 15, 10}, {-4, 1, 1, 1, 30, 20}, {8, 3, 8, 3, 3, 6}};
+    const Case cases[] = {{1, 1, {1, 1, 8, 16, 30, 20}},
+                          {0, 9, {1, 8, 8, 128, 30, 2}},
+                          {2, 2, {2, 2, 16, 32, 15, 10}},
+                          {-4, 1, {1, 1, 8, 16, 30, 20}},
+                          {8, 3, {8, 3, 64, 48, 3, 6}}};
     for (const Case& c : cases) {
         ConSetScale(c.sx, c.sy);
-        EXPECT_EQ(g_eng.con.con_scale_x, c.want_x);
-        EXPECT_EQ(g_eng.con.con_scale_y, c.want_y);
-        EXPECT_EQ(g_eng.con.con_cell_w, 8 * c.want_x);
-        EXPECT_EQ(g_eng.con.con_cell_h, 16 * c.want_y);
-        EXPECT_EQ(g_eng.con.con_cols, c.cols);
-        EXPECT_EQ(g_eng.con.con_rows, c.rows);
+        const CONSOLE& k = g_eng.con;
+        EXPECT_EQ((std::array{k.con_scale_x, k.con_scale_y, k.con_cell_w, k.con_cell_h, k.con_cols,
+                              k.con_rows}),
+                  c.want);
     }
-    ConSetScale(1, 1);
+    EXPECT_EQ(g_eng.con.con_color, 0xFFFF);
+    ConSetScale(1, 1); // the next open keeps the cell size
 }
 
-TEST_F(Console, ScaledGlyphFillsBlocks) {
+TEST_F(Console, ScaledGlyphsFillBlocksAndStayInsideTheBuffer) {
     ConSetScale(2, 3);
     ConDrawChar(10, 20, 0xDB); // full block: 16 x 48 pixels of console colour
     for (int y = 20; y < 20 + 48; ++y)
         for (int x = 10; x < 10 + 16; ++x) ASSERT_EQ(pixel(x, y), 0xFFFF) << x << "," << y;
     EXPECT_EQ(pixel(9, 20), 0);
     EXPECT_EQ(pixel(26, 20), 0);
-    ConSetScale(1, 1);
-}
-
-TEST_F(Console, DrawingNearTheEdgeStaysInsideTheBuffer) {
-    // The last column and row of cells and a glyph hanging off the buffer edge.
-    ConDrawChar(kW - 4, kH - 8, 0xDB);
+    ConDrawChar(kW - 4, kH - 8, 0xDB); // hangs off the buffer's corner
     EXPECT_EQ(pixel(kW - 1, kH - 1), 0xFFFF);
     EXPECT_EQ(pixel(kW - 5, kH - 1), 0);
+    ConSetScale(1, 1);
 }
 
 TEST_F(Console, ReopenAfterDoubledCloseKeepsTheConsoleInsideTheBuffer) {
@@ -159,11 +145,7 @@ TEST_F(EngineTest, ReportedMessagesAccumulateAndRestartAt1024) {
         ReportError("%s", c.add.c_str());
         EXPECT_EQ(last_error(), c.want);
     }
-}
-
-TEST_F(EngineTest, OverlongMessagesAreCutNotOverflowed) {
-    std::string huge(5000, 'h');
-    ReportError("%s", huge.c_str());
+    ReportError("%s", std::string(5000, 'h').c_str()); // cut, not overflowed
     EXPECT_EQ(last_error().size(), 1023u);
 }
 

@@ -128,25 +128,4 @@ TEST(Registry, NewAndFreeRecordKeepTagAndRegistryInStep) {
     EXPECT_EQ(alloc_outstanding(), before);
 }
 
-TEST(Alloc, FailureInjectionOnceAndSticky) {
-    alloc_fail_at(2, false);
-    void* a = eng_malloc(8);
-    void* b = eng_malloc(8);
-    void* c = eng_malloc(8);
-    EXPECT_NE(a, nullptr);
-    EXPECT_EQ(b, nullptr);
-    EXPECT_NE(c, nullptr);
-    alloc_fail_at(1, true);
-    void* d = eng_calloc(2, 4);
-    void* e = eng_malloc(4);
-    EXPECT_EQ(d, nullptr);
-    EXPECT_EQ(e, nullptr);
-    alloc_fail_at(0, false);
-    void* f = eng_malloc(4);
-    EXPECT_NE(f, nullptr);
-    eng_free(a);
-    eng_free(c);
-    eng_free(f);
-}
-
 } // namespace

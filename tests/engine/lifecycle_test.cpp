@@ -15,33 +15,28 @@ using vrx::test::EngineTest;
 
 namespace {
 
-TEST(Lifecycle, FlagsAreZeroAfterOpenAndDepthOnlyAfterClose) {
+TEST(Lifecycle, OpenSetsUpTheScreenAndCloseLeavesOnlyTheDepthFlag) {
     for (uint32_t reserved : {0u, 1u, 0xFFFFFFFFu}) {
-        ASSERT_EQ(VRX_Open(reserved, 240, 320, VRX_FMT_RGB565), 0);
+        ASSERT_EQ(VRX_Open(reserved, 176, 208, VRX_FMT_RGB565), 0);
         EXPECT_EQ(g_eng.eng_flags, 0u);
-        EXPECT_EQ(g_eng.screen_w, 240);
-        EXPECT_EQ(g_eng.buf_h, 320);
+        EXPECT_EQ(g_eng.screen_w, 176);
+        EXPECT_EQ(g_eng.buf_h, 208);
         EXPECT_NE(g_eng.own_depth_buf, nullptr);
         EXPECT_EQ(g_eng.depth_buf, g_eng.own_depth_buf);
         EXPECT_EQ(g_eng.color_buf, nullptr);
+        void* win = nullptr;
+        WINDOW_INFO info{};
+        ASSERT_EQ(VRX_GetCurrentWindow(&win), 0);
+        ASSERT_EQ(VRX_GetWindowInfo(win, &info), 0);
+        EXPECT_EQ(win, &g_eng.main_window);
+        EXPECT_EQ(info.width, 176);
+        EXPECT_EQ(info.height, 208);
+        EXPECT_EQ(VRX_DeleteWindow(win), -1); // the main window lives as long as the engine
         ASSERT_EQ(VRX_Close(), 0);
         EXPECT_EQ(g_eng.eng_flags, 4u);
         EXPECT_EQ(g_eng.own_depth_buf, nullptr);
         EXPECT_EQ(g_eng.draw_list, nullptr);
     }
-}
-
-TEST(Lifecycle, OpenSelectsMainWindowOfScreenSize) {
-    ASSERT_EQ(VRX_Open(0, 176, 208, VRX_FMT_RGB565), 0);
-    void* win = nullptr;
-    ASSERT_EQ(VRX_GetCurrentWindow(&win), 0);
-    EXPECT_EQ(win, &g_eng.main_window);
-    WINDOW_INFO info{};
-    ASSERT_EQ(VRX_GetWindowInfo(win, &info), 0);
-    EXPECT_EQ(info.width, 176);
-    EXPECT_EQ(info.height, 208);
-    EXPECT_EQ(VRX_DeleteWindow(win), -1); // the main window lives as long as the engine
-    VRX_Close();
 }
 
 TEST(Lifecycle, RecipTableIsFilledOnceAndExact) {

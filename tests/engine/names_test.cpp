@@ -32,29 +32,33 @@ TEST(Names, StrUpperFoldsAsciiAndSkipsTwoByteCharacters) {
     }
 }
 
-TEST(Names, StrCmpNoCase) {
+TEST(Names, CaseFoldingComparisons) {
+    constexpr int kWhole = INT32_MIN;
     struct Case {
         const char *a, *b;
+        int n; // kWhole: the whole strings
         int sign;
     };
-    const Case cases[] = {{"Box01", "BOX01", 0}, {"a", "ab", -1}, {"ab", "a", 1},
-                          {"abc", "ABD", -1},    {"", "", 0},     {"\xe9", "a", -1}};
+    const Case cases[] = {
+        {"Box01", "BOX01", kWhole, 0},
+        {"a", "ab", kWhole, -1},
+        {"ab", "a", kWhole, 1},
+        {"abc", "ABD", kWhole, -1},
+        {"", "", kWhole, 0},
+        {"\xe9", "a", kWhole, -1},
+        {"tga", "TGA", 3, 0},
+        {"tgx", "TGA", 2, 0},
+        {"tga", "TGB", 3, -1},
+        {"x", "y", 0, 0},
+        {"x", "y", -3, 0},
+        {"a\0b", "a\0c", 3, -1}, // a counted compare does not stop at a terminator
+    };
     for (const Case& c : cases) {
-        int r = StrCmpNoCase(c.a, c.b);
-        EXPECT_EQ((r > 0) - (r < 0), c.sign) << c.a << " vs " << c.b;
+        int r = c.n == kWhole ? StrCmpNoCase(c.a, c.b) : StrNCmpNoCase(c.a, c.b, c.n);
+        EXPECT_EQ((r > 0) - (r < 0), c.sign) << c.a << " vs " << c.b << " n=" << c.n;
     }
     // The difference is of the folded bytes: 'a' (as 'A') minus 'c' (as 'C').
     EXPECT_EQ(StrCmpNoCase("a", "c"), 'A' - 'C');
-}
-
-TEST(Names, StrNCmpNoCaseComparesExactlyN) {
-    EXPECT_EQ(StrNCmpNoCase("tga", "TGA", 3), 0);
-    EXPECT_EQ(StrNCmpNoCase("tgx", "TGA", 2), 0);
-    EXPECT_LT(StrNCmpNoCase("tga", "TGB", 3), 0);
-    EXPECT_EQ(StrNCmpNoCase("x", "y", 0), 0);
-    EXPECT_EQ(StrNCmpNoCase("x", "y", -3), 0);
-    // It does not stop at a terminator: "a\0b" and "a\0c" differ at the third byte.
-    EXPECT_NE(StrNCmpNoCase("a\0b", "a\0c", 3), 0);
 }
 
 TEST(Paths, SplittingAcceptsBothSeparators) {

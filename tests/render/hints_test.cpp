@@ -48,27 +48,23 @@ INSTANTIATE_TEST_SUITE_P(Rules, HintSequence, ::testing::ValuesIn(kSequences),
                          [](const auto& p) { return std::string(p.param.name); });
 
 TEST_F(EngineTest, DepthAfterLeavingDoubledModeWhileSortingGetsABuffer) {
-    // Leaving doubled mode with sorting on allocates no depth buffer; turning depth
-    // testing on later provides one, cleared to the farthest depth.
-    ASSERT_EQ(VRX_Hint(HINT_DOUBLED, 1), 0);
-    ASSERT_EQ(VRX_Hint(HINT_SORTED, 1), 0);
-    ASSERT_EQ(VRX_Hint(HINT_DOUBLED, 0), 0);
-    EXPECT_EQ(g_eng.depth_buf, nullptr);
-    ASSERT_EQ(VRX_Hint(HINT_SORTED, 0), 0);
-    ASSERT_EQ(VRX_Hint(HINT_DEPTH, 1), 0);
-    ASSERT_NE(g_eng.depth_buf, nullptr);
-    EXPECT_EQ(g_eng.depth_buf[0], 0x7FFFFFFF);
-    EXPECT_EQ(g_eng.depth_buf[kW * kH - 1], 0x7FFFFFFF);
-
-    // Out of memory at that point: reported, refused, flag unchanged.
-    ASSERT_EQ(VRX_Hint(HINT_DEPTH, 0), 0);
-    ASSERT_EQ(VRX_Hint(HINT_DOUBLED, 1), 0);
-    ASSERT_EQ(VRX_Hint(HINT_SORTED, 1), 0);
-    ASSERT_EQ(VRX_Hint(HINT_DOUBLED, 0), 0);
-    ASSERT_EQ(VRX_Hint(HINT_SORTED, 0), 0);
-    vrx::engine::alloc_fail_at(1, false);
-    EXPECT_EQ(VRX_Hint(HINT_DEPTH, 1), -1);
-    vrx::engine::alloc_fail_at(0, false);
+    // Leaving doubled mode with sorting on allocates no depth buffer; turning depth testing on
+    // later provides one, cleared to the farthest depth. The second time, out of memory: the
+    // hint is reported, refused and the flag stays off.
+    for (bool fail : {false, true}) {
+        for (auto [hint, value] :
+             {std::pair{HINT_DOUBLED, 1}, {HINT_SORTED, 1}, {HINT_DOUBLED, 0}, {HINT_SORTED, 0}})
+            ASSERT_EQ(VRX_Hint(hint, value), 0);
+        EXPECT_EQ(g_eng.depth_buf, nullptr);
+        vrx::engine::alloc_fail_at(fail ? 1 : 0, false);
+        EXPECT_EQ(VRX_Hint(HINT_DEPTH, 1), fail ? -1 : 0);
+        vrx::engine::alloc_fail_at(0, false);
+        if (fail) break;
+        ASSERT_NE(g_eng.depth_buf, nullptr);
+        EXPECT_EQ(g_eng.depth_buf[0], 0x7FFFFFFF);
+        EXPECT_EQ(g_eng.depth_buf[kW * kH - 1], 0x7FFFFFFF);
+        ASSERT_EQ(VRX_Hint(HINT_DEPTH, 0), 0);
+    }
     EXPECT_EQ(g_eng.eng_flags & 4u, 0u);
     EXPECT_EQ(last_error(), "Allocate depth buffer fail in VRX_Hint!!\n");
 }

@@ -1,6 +1,7 @@
 // Render-buffer fills, block copies, the 2x2 reduction and doubled mode.
 #include <gtest/gtest.h>
 
+#include <array>
 #include <numeric>
 
 #include "engine/alloc.h"
@@ -84,22 +85,15 @@ TEST(RenderBuffer, DownsampleAveragesWithChannelTruncation) {
     }
 }
 
-TEST(RenderBuffer, DownsampleInPlaceHandlesWidthsNotMultipleOfFour) {
-    // 5 x 2 result from a 10 x 4 source, reduced into the same buffer: every column
-    // of every row is written from its own source pixels.
-    constexpr int w = 5, h = 2;
-    std::vector<uint16_t> buf(4 * w * h);
-    for (int y = 0; y < 2 * h; ++y)
-        for (int x = 0; x < 2 * w; ++x)
-            buf[y * 2 * w + x] = static_cast<uint16_t>(((x / 2 + y / 2 * w) & 31) << 11);
-    vrx::render::Downsample2x2(w, h, buf.data(), buf.data());
-    for (int j = 0; j < h; ++j)
-        for (int i = 0; i < w; ++i) {
-            uint16_t red = static_cast<uint16_t>(((i + j * w) & 31) << 11);
-            uint32_t half = ((red >> 1) & 0x7BEFu);
-            uint32_t a = ((half + half) >> 1) & 0x7BEFu;
-            EXPECT_EQ(buf[j * w + i], static_cast<uint16_t>(a + a)) << i << "," << j;
-        }
+TEST(RenderBuffer, DownsampleInPlaceReducesEveryColumn) {
+    // A 5 x 1 result from a 10 x 2 source in the same buffer: blocks of white, black, red 31,
+    // blue 31 and green 63. Each channel loses its low bit (31 -> 15) before the rows add up.
+    std::vector<uint16_t> buf = {0xFFFF, 0xFFFF, 0,      0,      0xF800, 0xF800, 0x001F,
+                                 0x001F, 0x07E0, 0x07E0, 0xFFFF, 0xFFFF, 0,      0,
+                                 0xF800, 0xF800, 0x001F, 0x001F, 0x07E0, 0x07E0};
+    vrx::render::Downsample2x2(5, 1, buf.data(), buf.data());
+    const std::vector<uint16_t> want = {0xF7DE, 0, 0xF000, 0x001E, 0x07C0};
+    EXPECT_EQ(std::vector<uint16_t>(buf.begin(), buf.begin() + 5), want);
 }
 
 TEST_F(EngineTest, BlockCopiesRoundTripAndRespectTheBuffer) {
@@ -151,8 +145,7 @@ TEST_F(EngineTest, GetAndSetRenderBuffer) {
     uint16_t* c = nullptr;
     int32_t* z = nullptr;
     ASSERT_EQ(VRX_GetRenderBuffer(&w, &h, &c, &z), 0);
-    EXPECT_EQ(w, kW);
-    EXPECT_EQ(h, kH);
+    EXPECT_EQ((std::array{w, h}), (std::array{kW, kH}));
     EXPECT_EQ(c, color.data());
     EXPECT_EQ(z, g_eng.own_depth_buf);
     EXPECT_EQ(VRX_GetRenderBuffer(nullptr, nullptr, nullptr, nullptr), 0);
@@ -168,17 +161,14 @@ TEST_F(EngineTest, DoubledModeDrawsAtTwiceTheSizeAndSwapReduces) {
     ASSERT_EQ(VRX_Hint(HINT_DOUBLED, 1), 0);
     ASSERT_EQ(VRX_Hint(HINT_DOUBLED, 1), 0); // twice doubles once
     EXPECT_EQ(g_eng.eng_flags, 8u);
-    EXPECT_EQ(g_eng.buf_w, 2 * kW);
-    EXPECT_EQ(g_eng.buf_h, 2 * kH);
-    EXPECT_EQ(g_eng.main_window.width, 2 * kW);
-    EXPECT_EQ(g_eng.con.con_scale_x, 2);
-    EXPECT_EQ(g_eng.clip_right, 2 * kW);
+    EXPECT_EQ((std::array{g_eng.buf_w, g_eng.buf_h, g_eng.main_window.width, g_eng.clip_right,
+                          g_eng.con.con_scale_x}),
+              (std::array{2 * kW, 2 * kH, 2 * kW, 2 * kW, 2}));
 
     int32_t w = 0, h = 0;
     uint16_t* c = nullptr;
     ASSERT_EQ(VRX_GetRenderBuffer(&w, &h, &c, nullptr), 0);
-    EXPECT_EQ(w, kW);
-    EXPECT_EQ(h, kH);
+    EXPECT_EQ((std::array{w, h}), (std::array{kW, kH}));
     ASSERT_NE(c, nullptr);
     EXPECT_NE(c, color.data());
     EXPECT_EQ(VRX_SetRenderBuffer(color.data(), nullptr), -1);
@@ -204,7 +194,11 @@ TEST_F(EngineTest, DoubledModeDrawsAtTwiceTheSizeAndSwapReduces) {
     ASSERT_EQ(VRX_SetRenderBuffer(color.data(), nullptr), 0);
 }
 
-TEST_F(EngineTest, EnteringDoubledModeOutOfMemoryStaysSingle) {
+TEST_F(EngineTest, SwapForgetsTheCurrentMaterialAndDoublingOutOfMemoryStaysSingle) {
+    g_eng.cur_material = reinterpret_cast<vrx::scene::MATERIAL*>(&g_eng);
+    ASSERT_EQ(VRX_SwapRenderBuffer(), 0);
+    EXPECT_EQ(g_eng.cur_material, nullptr);
+
     long before = vrx::engine::alloc_outstanding();
     vrx::engine::alloc_fail_at(1, false);
     EXPECT_EQ(VRX_Hint(HINT_DOUBLED, 1), 0);
@@ -214,12 +208,6 @@ TEST_F(EngineTest, EnteringDoubledModeOutOfMemoryStaysSingle) {
     EXPECT_EQ(g_eng.color_buf, color.data());
     EXPECT_EQ(vrx::engine::alloc_outstanding(), before);
     EXPECT_EQ(last_error(), "Allocate double buffers fail in EnterDoubleMode!!\n");
-}
-
-TEST_F(EngineTest, SwapForgetsTheCurrentMaterial) {
-    g_eng.cur_material = reinterpret_cast<vrx::scene::MATERIAL*>(&g_eng);
-    ASSERT_EQ(VRX_SwapRenderBuffer(), 0);
-    EXPECT_EQ(g_eng.cur_material, nullptr);
 }
 
 } // namespace
