@@ -52,39 +52,6 @@ TEST(RenderBuffer, FourBytePixelScreensClearWholeGroupsOfFour) {
     VRX_Close();
 }
 
-TEST(RenderBuffer, FillWordsLeavesTheRemainderBytes) {
-    for (uint32_t bytes : {0u, 3u, 4u, 7u, 512u, 515u, 1030u}) {
-        std::vector<unsigned char> buf(1040, 0xAA);
-        vrx::render::FillWords(buf.data(), 0x11223344, bytes);
-        for (uint32_t i = 0; i < buf.size(); ++i) {
-            // Little-endian words: bytes 44 33 22 11 repeat over the whole words only.
-            auto want = static_cast<unsigned char>(
-                i < bytes / 4 * 4 ? (0x11223344u >> (8 * (i % 4))) & 0xFFu : 0xAAu);
-            ASSERT_EQ(buf[i], want) << bytes << " at " << i;
-        }
-    }
-}
-
-TEST(RenderBuffer, DownsampleAveragesWithChannelTruncation) {
-    struct Case {
-        uint16_t p0, p1, q0, q1, want;
-    };
-    const Case cases[] = {
-        {0xFFFF, 0xFFFF, 0xFFFF, 0xFFFF, 0xF7DE}, // four whites
-        {0xFFFF, 0xFFFF, 0x0000, 0x0000, 0x7BEF}, // white over black
-        {0x0000, 0x0000, 0x0000, 0x0000, 0x0000},
-        // Red 31 beside black: each row averages to red 14 (0x3800), the two rows add up.
-        {0xF800, 0x0000, 0xF800, 0x0000, 0x7000},
-    };
-    for (const Case& c : cases) {
-        // A 1x1 result from a 2x2 source.
-        uint16_t src[4] = {c.p0, c.p1, c.q0, c.q1};
-        uint16_t dst[1] = {0x1234};
-        vrx::render::Downsample2x2(1, 1, src, dst);
-        EXPECT_EQ(dst[0], c.want) << std::hex << c.p0;
-    }
-}
-
 TEST(RenderBuffer, DownsampleInPlaceReducesEveryColumn) {
     // A 5 x 1 result from a 10 x 2 source in the same buffer: blocks of white, black, red 31,
     // blue 31 and green 63. Each channel loses its low bit (31 -> 15) before the rows add up.
