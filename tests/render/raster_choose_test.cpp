@@ -2,150 +2,76 @@
 // self-illumination, and the polygon-list chooser over texel format and opacity.
 #include <gtest/gtest.h>
 
+#include <string_view>
+#include <tuple>
+
 #include "assets/texture.h"
 #include "render/raster_choose.h"
 #include "scene/material.h"
 
 using namespace vrx::render;
+using namespace vrx::scene;
 using vrx::assets::TEXTURE;
-using vrx::scene::MATERIAL;
-using vrx::scene::UvFunc;
 
 namespace {
 
-constexpr int32_t kOne = 0x10000;
-constexpr uint32_t kRefl = vrx::scene::MAT_REFLECT;
-constexpr uint32_t kUntex = vrx::scene::MAT_UNTEXTURED;
-
-struct OpaqueCase {
-    bool textured;
-    uint32_t flags;        // MAT_REFLECT / MAT_UNTEXTURED / MAT_TWO_SIDED
-    uint32_t shading_code; // bits 0x38
-    int32_t self_illum;
-    RasterMode mode;
-    UvFunc uv; // with both scroll offsets 0
-};
-
-const OpaqueCase kOpaque[] = {
-    // Textured, drawn textured.
-    {true, 0, 0, 0, mode_tex_flat, vrx::scene::uv_copy},
-    {true, 0, 0, kOne, mode_tex, vrx::scene::uv_copy},
-    {true, 0, 8, 0x8000, mode_tex_gouraud, vrx::scene::uv_copy},
-    {true, 0, 8, kOne, mode_tex, vrx::scene::uv_copy}, // self-illuminated beats Gouraud
-    {true, 0, 16, 0x8000, mode_tex_add, vrx::scene::uv_copy},
-    {true, 0, 16, kOne, mode_tex_add, vrx::scene::uv_copy}, // additive whatever the self-illum
-    {true, 0, 24, kOne, mode_tex_add, vrx::scene::uv_copy},
-    {true, 0, 24, 0, mode_tex_add, vrx::scene::uv_copy},
-    {true, 0, 32, 0x8000, mode_tex_flat, vrx::scene::uv_copy}, // codes 32..56: flat
-    {true, 0, 40, 0x8000, mode_tex_flat, vrx::scene::uv_copy}, // 40 has bit 8, still flat
-    {true, 0, 56, 0x8000, mode_tex_flat, vrx::scene::uv_copy},
-    {true, 0, 48, kOne, mode_tex, vrx::scene::uv_copy},
-    {true, 0, 0, kOne - 1, mode_tex_flat, vrx::scene::uv_copy}, // 1.0 exactly, not nearly
-    {true, kRefl, 0, 0, mode_tex, vrx::scene::uv_sphere},
-    {true, kRefl, 16, 0x8000, mode_tex, vrx::scene::uv_sphere}, // reflection beats shading 2
-    {true, kRefl, 8, 0, mode_tex, vrx::scene::uv_sphere},
-    {true, vrx::scene::MAT_TWO_SIDED, 8, 0, mode_tex_gouraud, vrx::scene::uv_copy},
-    // Textured but MAT_UNTEXTURED: as untextured, no generator.
-    {true, kUntex, 8, kOne, mode_flat, vrx::scene::uv_none},
-    {true, kUntex, 8, 0x8000, mode_gouraud, vrx::scene::uv_none},
-    {true, kUntex | kRefl, 24, 0x8000, mode_gouraud, vrx::scene::uv_none},
-    {true, kUntex, 0, 0x8000, mode_flat, vrx::scene::uv_none},
-    // No texture.
-    {false, 0, 8, kOne, mode_flat, vrx::scene::uv_none},
-    {false, 0, 8, 0x8000, mode_gouraud, vrx::scene::uv_none},
-    {false, 0, 0, 0x8000, mode_flat, vrx::scene::uv_none},
-    {false, 0, 0, 0, mode_flat, vrx::scene::uv_none},
-    {false, 0, 24, 0, mode_gouraud, vrx::scene::uv_none},
-    {false, 0, 32, 0x8000, mode_gouraud, vrx::scene::uv_none}, // any code but 0
-    {false, kRefl, 16, kOne, mode_flat, vrx::scene::uv_none},
-};
-
 TEST(RasterChoose, OpaquePathModeAndGenerator) {
+    // One letter per shading code (0, 8, 16, 24, then 40, 48 and 56, which no setter makes)
+    // and self-illum (0, 1.0 less one raw unit, 1.0): f flat, g Gouraud, T texture,
+    // F texture x flat, G texture x Gouraud, A texture + colour. Scroll offsets are 0.
+    const uint32_t codes[] = {0, 8, 16, 24, 40, 48, 56};
+    const int32_t illums[] = {0, kOne - 1, kOne};
+    const RasterMode letters[] = {mode_flat,     mode_gouraud,     mode_tex,
+                                  mode_tex_flat, mode_tex_gouraud, mode_tex_add};
+    const std::tuple<bool, uint32_t, const char*, UvFunc> cases[] = {
+        {true, 0, "FFT GGT AAA AAA FFT FFT FFT", uv_copy},
+        {true, MAT_TWO_SIDED, "FFT GGT AAA AAA FFT FFT FFT", uv_copy},
+        {true, MAT_REFLECT, "TTT TTT TTT TTT TTT TTT TTT", uv_sphere},
+        {true, MAT_UNTEXTURED | MAT_REFLECT, "fff ggf ggf ggf ggf ggf ggf", uv_none},
+        {false, 0, "fff ggf ggf ggf ggf ggf ggf", uv_none},
+        {false, MAT_REFLECT, "fff ggf ggf ggf ggf ggf ggf", uv_none}};
     TEXTURE tex{};
-    int row = 0;
-    for (const OpaqueCase& c : kOpaque) {
-        MATERIAL m{};
-        m.texture = c.textured ? &tex : nullptr;
-        m.flags = c.flags | c.shading_code;
-        m.self_illum = c.self_illum;
-        m.raster_mode = mode_none;
-        m.uv_func = vrx::scene::uv_scroll; // stale value the chooser must overwrite
-        EXPECT_EQ(raster_mode_for(m), c.mode) << "row " << row;
-        choose_raster_mode(&m);
-        EXPECT_EQ(m.raster_mode, c.mode) << "row " << row;
-        EXPECT_EQ(m.uv_func, c.uv) << "row " << row;
-        ++row;
-    }
-}
-
-TEST(RasterChoose, GeneratorFollowsScrollOffsets) {
-    struct Case {
-        uint32_t flags;
-        int32_t su, sv;
-        UvFunc uv;
-        int32_t off_u, off_v; // 7, 7: left untouched
-    };
-    const Case cases[] = {
-        {0, 0, 0, vrx::scene::uv_copy, 7, 7},
-        {0, 0x100, 0, vrx::scene::uv_scroll, 0x100, 0},
-        {0, 0, -0x8000, vrx::scene::uv_scroll, 0, -0x8000},
-        {kRefl, 0, 0, vrx::scene::uv_sphere, 7, 7},
-        {kRefl, 0x4000, 0x2000, vrx::scene::uv_sphere_scroll, 0x4000, 0x2000},
-    };
-    TEXTURE tex{};
-    for (const Case& c : cases) {
-        MATERIAL m{};
-        m.texture = &tex;
-        m.flags = c.flags;
-        m.scroll_u = c.su;
-        m.scroll_v = c.sv;
-        m.uv_offset_u = m.uv_offset_v = 7;
-        choose_raster_mode(&m);
-        EXPECT_EQ(m.uv_func, c.uv);
-        EXPECT_EQ(m.uv_offset_u, c.off_u);
-        EXPECT_EQ(m.uv_offset_v, c.off_v);
+    for (const auto& [textured, flags, modes, uv] : cases) {
+        for (size_t i = 0; i < std::size(codes) * std::size(illums); ++i) {
+            const RasterMode want =
+                letters[std::string_view("fgTFGA").find(modes[i / 3 * 4 + i % 3])];
+            MATERIAL m{};
+            m.texture = textured ? &tex : nullptr;
+            m.flags = flags | codes[i / 3];
+            m.self_illum = illums[i % 3];
+            m.uv_func = uv_scroll; // stale: the chooser must overwrite it
+            choose_raster_mode(&m);
+            EXPECT_EQ(std::pair(m.raster_mode, m.uv_func), std::pair(want, uv))
+                << "flags " << flags << " code " << codes[i / 3] << " illum " << illums[i % 3];
+        }
     }
 }
 
 TEST(RasterChoose, PolygonListPath) {
-    struct Case {
-        bool textured;
-        int32_t alpha_kind;
-        int32_t opacity;   // diffuse_scaled.a
-        int32_t diffuse_a; // diffuse.a
-        int32_t self_illum;
-        RasterMode mode;
-    };
-    const Case cases[] = {
-        {true, 0, kOne, kOne, 0, mode_tex},
-        {true, 0, kOne, 0x8000, 0x8000, mode_tex},     // the scaled alpha counts, not diffuse
-        {true, 0, 0x8000, kOne, kOne, mode_tex_blend}, // translucent 565
-        {true, 0, 0x8000, kOne, 0x8000, mode_tex_blend_lit},
-        {true, 0, kOne + 1, kOne, kOne, mode_tex_blend}, // exactly 1.0 only
-        {true, 1, kOne, kOne, kOne, mode_tex_blend},     // 4444 texels always blend
-        {true, 1, kOne, kOne, 0, mode_tex_blend_lit},
-        {true, 2, kOne, kOne, kOne, mode_tex_blend}, // 8888 texels always blend
-        {true, 2, kOne, kOne, kOne - 1, mode_tex_blend_lit},
-        {false, 0, 0x8000, kOne, 0, mode_flat}, // untextured: diffuse alpha decides
-        {false, 0, kOne, 0x8000, 0, mode_gouraud_blend},
-        {false, 0, kOne, 0, kOne, mode_gouraud_blend},
-        {false, 0, kOne, kOne, 0, mode_flat},
-    };
-    int row = 0;
-    for (const Case& c : cases) {
+    // Texel kind (-1: untextured), diffuse_scaled.a, diffuse.a, self-illum. Textured: only 565
+    // texels at a scaled opacity of exactly 1.0 skip blending (diffuse.a does not count), else
+    // lit unless self-illuminated. Untextured: diffuse.a alone decides.
+    const std::tuple<int32_t, int32_t, int32_t, int32_t, RasterMode> cases[] = {
+        {0, kOne, 0x8000, 0x8000, mode_tex},
+        {0, 0x8000, kOne, kOne, mode_tex_blend},
+        {0, 0x8000, kOne, 0x8000, mode_tex_blend_lit},
+        {0, kOne + 1, kOne, kOne, mode_tex_blend},
+        {1, kOne, kOne, kOne, mode_tex_blend},
+        {2, kOne, kOne, kOne - 1, mode_tex_blend_lit},
+        {-1, 0x8000, kOne, 0, mode_flat},
+        {-1, kOne, 0x8000, 0, mode_gouraud_blend}};
+    for (const auto& [kind, opacity, diffuse_a, self_illum, mode] : cases) {
         TEXTURE tex{};
-        tex.alpha_kind = c.alpha_kind;
+        tex.alpha_kind = kind;
         MATERIAL m{};
-        m.texture = c.textured ? &tex : nullptr;
-        m.diffuse_scaled.a = c.opacity;
-        m.diffuse.a = c.diffuse_a;
-        m.self_illum = c.self_illum;
-        m.uv_func = vrx::scene::uv_copy;
-        EXPECT_EQ(list_raster_mode_for(m), c.mode) << "row " << row;
+        m.texture = kind >= 0 ? &tex : nullptr;
+        m.diffuse_scaled.a = opacity;
+        m.diffuse.a = diffuse_a;
+        m.self_illum = self_illum;
+        m.uv_func = uv_copy;
         choose_list_raster_mode(&m);
-        EXPECT_EQ(m.raster_mode, c.mode) << "row " << row;
-        EXPECT_EQ(m.uv_func, vrx::scene::uv_copy) << "row " << row; // generator untouched
-        ++row;
+        EXPECT_EQ(std::pair(m.raster_mode, m.uv_func), std::pair(mode, uv_copy)) // uv untouched
+            << kind << " " << opacity << " " << diffuse_a << " " << self_illum;
     }
 }
 
