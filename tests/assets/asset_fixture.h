@@ -1,20 +1,18 @@
-// Fixture for the asset tests: an open engine, a fresh temporary directory for files the
-// test writes with the format writers, and no pack selected or data path set around it.
+// Fixture for the asset tests: an open engine with no data path set, and a fresh temporary
+// directory for the files a test writes with the format writers.
 #pragma once
 
 #include <gtest/gtest.h>
 
 #include <stdlib.h>
 
-#include <cstdint>
 #include <filesystem>
 #include <string>
 #include <vector>
 
-#include "engine/state.h"
+#include "engine/alloc.h"
 #include "formats/tga_writer.h"
 #include "formats/v3z_writer.h"
-#include "lite_vrx.h"
 #include "support/engine_fixture.h"
 
 namespace vrx::test {
@@ -30,27 +28,19 @@ class AssetTest : public EngineTest {
         ASSERT_EQ(VRX_SetDefaultDataPath(""), 0);
     }
     void TearDown() override {
-        VRX_SelectResourceBuffer(nullptr);
-        VRX_SelectResourceFile(nullptr);
-        VRX_SetDefaultDataPath("");
-        EngineTest::TearDown();
-        std::error_code ec;
-        std::filesystem::remove_all(dir, ec);
+        EngineTest::TearDown(); // closing frees the pack file's directory
+        std::filesystem::remove_all(dir);
     }
-
     // Writes `bytes` to dir/name and returns the full path.
     std::string put(const std::string& name, const std::vector<uint8_t>& bytes) const {
-        std::string path = dir + "/" + name;
-        EXPECT_TRUE(formats::save_file(path, bytes));
-        return path;
+        EXPECT_TRUE(formats::save_file(dir + "/" + name, bytes));
+        return dir + "/" + name;
     }
-
+    // Little-endian patching of a pack or file image.
+    static void poke32(std::vector<uint8_t>& b, size_t at, uint32_t v) {
+        for (int i = 0; i < 4; ++i) b[at + size_t(i)] = static_cast<uint8_t>(v >> (8 * i));
+    }
     std::string dir;
 };
-
-// Little-endian patching of a pack or file image.
-inline void poke32(std::vector<uint8_t>& b, size_t at, uint32_t v) {
-    for (int i = 0; i < 4; ++i) b[at + size_t(i)] = static_cast<uint8_t>(v >> (8 * i));
-}
 
 } // namespace vrx::test
