@@ -47,32 +47,19 @@ TEST_F(Console, FontIsCodePage437) {
     EXPECT_GT(bits(1), 20);
 }
 
-TEST_F(Console, BackspaceMovesBackAndDrawsOver) {
-    ConPutString("AB\bC");
-    EXPECT_EQ(g_eng.con.con_col, 2);
-    EXPECT_EQ(g_eng.con.con_row, 0);
-    EXPECT_TRUE(cell_shows(0, 0, 'A'));
-    EXPECT_TRUE(cell_shows(1, 0, 'C'));
+TEST_F(Console, ControlCharactersAndWrapping) {
+    ConPutString("AB\bC"); // backspace moves back and draws over
+    EXPECT_TRUE(cell_shows(0, 0, 'A') && cell_shows(1, 0, 'C'));
     ConPutString("\b\b\b\b"); // never below column 0
     EXPECT_EQ(g_eng.con.con_col, 0);
-}
-
-TEST_F(Console, WrapsLinesAndRowsWithoutScrolling) {
-    std::string line(30, 'x');
-    ConPutString(line.c_str());
-    EXPECT_EQ(g_eng.con.con_col, 0); // the 30th character ends the line
-    EXPECT_EQ(g_eng.con.con_row, 1);
+    ConPutString(std::string(30, 'x').c_str()); // the 30th character ends the line
+    EXPECT_EQ((std::array{g_eng.con.con_col, g_eng.con.con_row}), (std::array{0, 1}));
     ConPutString("y");
     EXPECT_TRUE(cell_shows(0, 1, 'y'));
-
-    g_eng.con.con_row = 19;
-    g_eng.con.con_col = 5;
-    ConPutString("\n");
-    EXPECT_EQ(g_eng.con.con_row, 0);
-    EXPECT_EQ(g_eng.con.con_col, 0);
-    ConPutString("ab\rc");
-    EXPECT_TRUE(cell_shows(0, 0, 'c'));
-    EXPECT_TRUE(cell_shows(1, 0, 'b'));
+    g_eng.con.con_row = 19; // a newline on the last row starts again at the top, no scrolling
+    ConPutString("\nab\rc");
+    EXPECT_TRUE(cell_shows(0, 0, 'c') && cell_shows(1, 0, 'b'));
+    EXPECT_EQ((std::array{g_eng.con.con_col, g_eng.con.con_row}), (std::array{1, 0}));
 }
 
 TEST_F(Console, ScaleIsClampedAndSizesFollow) {
@@ -119,43 +106,27 @@ TEST_F(Console, ReopenAfterDoubledCloseKeepsTheConsoleInsideTheBuffer) {
     ConSetScale(1, 1);
 }
 
-TEST_F(Console, NoColourBufferOnlyKeepsTheText) {
-    g_eng.color_buf = nullptr;
-    ReportError("quiet %d\n", 5);
-    EXPECT_EQ(last_error(), "quiet 5\n");
-    g_eng.color_buf = color.data();
-}
-
-TEST_F(EngineTest, ReportedMessagesAccumulateAndRestartAt1024) {
-    ReportError("first %s\n", "one");
+TEST_F(Console, ReportedMessagesShowAccumulateAndRestartAt1024) {
+    ReportError("A%s\n", "B");
     ReportError("second\n");
-    EXPECT_EQ(last_error(), "first one\nsecond\n");
+    EXPECT_EQ(last_error(), "AB\nsecond\n");
+    EXPECT_TRUE(cell_shows(0, 0, 'A') && cell_shows(1, 0, 'B') && cell_shows(0, 1, 's'));
 
     // 1000 bytes held: 30 more would reach 1024, so the text restarts; 20 more fit.
-    std::string fill(1000, 'f');
-    std::string thirty(29, 't');
-    std::string twenty(19, 'w');
-    struct Case {
-        const std::string& add;
-        std::string want;
-    };
-    const Case cases[] = {{thirty + "\n", thirty + "\n"}, {twenty + "\n", fill + twenty + "\n"}};
-    for (const Case& c : cases) {
+    const std::string fill(1000, 'f'), thirty(29, 't'), twenty(19, 'w');
+    const std::pair<std::string, std::string> cases[] = {{thirty + "\n", thirty + "\n"},
+                                                         {twenty + "\n", fill + twenty + "\n"}};
+    for (const auto& [add, want] : cases) {
         std::memcpy(g_eng.last_error, fill.c_str(), fill.size() + 1);
-        ReportError("%s", c.add.c_str());
-        EXPECT_EQ(last_error(), c.want);
+        ReportError("%s", add.c_str());
+        EXPECT_EQ(last_error(), want);
     }
     ReportError("%s", std::string(5000, 'h').c_str()); // cut, not overflowed
     EXPECT_EQ(last_error().size(), 1023u);
-}
-
-TEST_F(EngineTest, ReportedTextShowsOnTheConsole) {
-    ReportError("A\n");
-    // Cell (0, 0) holds an 'A' in white on black.
-    for (int r = 0; r < 16; ++r)
-        for (int k = 0; k < 8; ++k)
-            ASSERT_EQ(pixel(k, r), glyph_bit('A', k, r) ? 0xFFFF : 0) << k << "," << r;
-    EXPECT_EQ(g_eng.con.con_row, 1);
+    g_eng.color_buf = nullptr; // no buffer: the text is kept, nothing is drawn
+    ReportError("quiet\n");
+    EXPECT_EQ(last_error(), "quiet\n");
+    g_eng.color_buf = color.data();
 }
 
 } // namespace
