@@ -7,6 +7,7 @@
 #include "engine/alloc.h"
 #include "engine/state.h"
 #include "render/render_buffer.h"
+#include "render/vport.h"
 #include "support/engine_fixture.h"
 
 using vrx::engine::g_eng;
@@ -140,6 +141,14 @@ TEST_F(EngineTest, DoubledModeDrawsAtTwiceTheSizeAndSwapReduces) {
     EXPECT_NE(c, color.data());
     EXPECT_EQ(VRX_SetRenderBuffer(color.data(), nullptr), -1);
     EXPECT_EQ(last_error(), "");
+    // Window geometry is doubled going in and halved coming out.
+    WINDOW_INFO info{10, 20, 100, 50, 0};
+    void* win = nullptr;
+    ASSERT_EQ(VRX_NewWindow(&info, &win), 0);
+    auto* vp = static_cast<vrx::render::VPORT*>(win);
+    EXPECT_EQ((std::array{vp->x, vp->y, vp->width, vp->height}), (std::array{20, 40, 200, 100}));
+    ASSERT_EQ(VRX_GetWindowInfo(win, &info), 0);
+    EXPECT_EQ((std::array{info.x, info.y, info.width}), (std::array{10, 20, 100}));
 
     // Paint the top-left 2x2 block white and the rest black, then end the frame.
     ASSERT_EQ(VRX_ClearRenderBuffer(0, 0, 0), 0);
@@ -157,6 +166,7 @@ TEST_F(EngineTest, DoubledModeDrawsAtTwiceTheSizeAndSwapReduces) {
     EXPECT_EQ(g_eng.color_buf, nullptr); // the host hands a buffer over again
     EXPECT_EQ(g_eng.con.con_scale_x, 1);
     EXPECT_EQ(g_eng.depth_buf, g_eng.own_depth_buf);
+    EXPECT_EQ((std::array{vp->x, vp->width, vp->height}), (std::array{20, 100, 50})); // x stays
     EXPECT_EQ(VRX_Hint(HINT_DOUBLED, 0), 0); // not doubled: nothing
     ASSERT_EQ(VRX_SetRenderBuffer(color.data(), nullptr), 0);
 }
