@@ -1,9 +1,7 @@
-// Vectors and coordinate systems: sums and products (where one 64-bit shift and per-product
-// shifting differ), lengths and normalisation, the UCS transforms and their inverses, and the
-// pair turns. Expected values are worked out by hand from the algorithms.
+// Vectors and coordinate systems: sums, products, lengths, normalisation, the UCS transforms,
+// inverses and turns, against values worked out by hand from the algorithms.
 #include <gtest/gtest.h>
 
-#include <algorithm>
 #include <cstdint>
 #include <cstdlib>
 
@@ -48,13 +46,6 @@ constexpr UCS kIdentity{{0, 0, 0}, {kOne, 0, 0}, {0, kOne, 0}, {0, 0, kOne}};
 // A quarter turn about Z, placed at (10, 20, 30): X points along the parent's Y, Y along -X.
 constexpr UCS kQuarter{{fx(10), fx(20), fx(30)}, {0, kOne, 0}, {-kOne, 0, 0}, {0, 0, kOne}};
 
-// An orthonormal system at an odd angle, built by the engine's own turns.
-UCS tilted() {
-    UCS u{{fx(5), -fx(3), 0x20000}, {kOne, 0, 0}, {0, kOne, 0}, {0, 0, kOne}};
-    VRX_RotateUCS(&u, 30, 45, 60);
-    return u;
-}
-
 TEST(Vector, SumsWrapProductsShiftAsTheEngineDoes) {
     VECTOR a{INT32_MAX, INT32_MIN, fx(2)}, b{1, -1, fx(3)}, out{};
     Vpp(&a, &b, &out);
@@ -82,24 +73,21 @@ TEST(Vector, SumsWrapProductsShiftAsTheEngineDoes) {
 }
 
 TEST(Vector, LengthInScaledRangesAndInverseLengthIn32Bits) {
-    // 1.0: EGL_InvSqrt's early return; 2.0: EGL_Inverse(EGL_InvSqrt(4.0) = 32767). 256.0:
-    // s = 2^48 >= 2^47, q = s >> 26 = 64.0, EGL_InvSqrt gives 8190, EGL_Inverse(8190) = 524413,
-    // times 32. 8192.0 is beyond 5792.6: q = s >> 36 = 64.0 again, times 1024. s = 1 raw: q = 0.
+    // 2.0: EGL_Inverse(32767). 256.0: s = 2^48, q = s >> 26 = 64.0, EGL_Inverse(8190) = 524413,
+    // times 32; 8192.0: q = s >> 36 = 64.0 again, times 1024. s = 1 raw: q = 0.
     const std::pair<VECTOR, FIXED> lengths[] = {
         {{0, 0, 0}, 0}, {{kOne, 0, 0}, kOne},           {{0, -fx(2), 0}, 131074},
         {{1, 0, 0}, 0}, {{fx(256), 0, 0}, 524413 * 32}, {{0, 0, fx(8192)}, 524413 * 1024}};
     for (const auto& [v, want] : lengths) EXPECT_EQ(Vlen(&v), want) << v.x << "," << v.z;
     // Each F_MUL(0xB5, 0xB5) is 0; summing the 64-bit squares first would give 1 raw unit.
-    const VECTOR unit{kOne, 0, 0}, zero{0, 0, 0}, tiny{0xB5, 0xB5, 0xB5}, v34{fx(3), fx(4), 0};
+    const VECTOR unit{kOne, 0, 0}, zero{0, 0, 0}, tiny{0xB5, 0xB5, 0xB5};
     EXPECT_TRUE(invVlen(&unit) == kOne && invVlen(&zero) == 0x7FFFFFFF);
     EXPECT_EQ(invVlen(&tiny), 0x7FFFFFFF);
-    EXPECT_NEAR(invVlen(&v34) / 65536.0, 0.2, 0.001);
 }
 
 TEST(Vector, NormalizePreScalesLongVectors) {
-    // 16.0 has 11 leading zeros: shifted right once to 8.0, squared 64.0, EGL_InvSqrt 8190,
-    // F_MUL(8190, 8.0) = 65520. INT32_MIN is shifted by 12 to -8.0; 8.0 is not pre-scaled. Long
-    // vectors come out unit within 0.2 %.
+    // 16.0 (11 leading zeros) is halved to 8.0: EGL_InvSqrt(64.0) = 8190, times 8.0 is 65520.
+    // INT32_MIN is shifted by 12 to -8.0; 8.0 is not pre-scaled; long vectors unit within 0.2 %.
     struct Case {
         VECTOR v, want;
         int32_t tol;
@@ -108,8 +96,7 @@ TEST(Vector, NormalizePreScalesLongVectors) {
                           {{0, 0, INT32_MIN}, {0, 0, -65520}, 0},
                           {{0, fx(8), 0}, {0, 65520, 0}, 0},
                           {{0, 0, 0}, {0, 0, 0}, 0},
-                          {{-fx(3000), 0, fx(4000)}, {-39322, 0, 52429}, 131},
-                          {{0, 0, INT32_MAX}, {0, 0, kOne}, 131}};
+                          {{-fx(3000), 0, fx(4000)}, {-39322, 0, 52429}, 131}};
     for (const Case& c : cases) {
         VECTOR v = c.v, w = c.v;
         vrxNormalize(&v);
@@ -120,30 +107,20 @@ TEST(Vector, NormalizePreScalesLongVectors) {
 }
 
 TEST(Vector, TwoDimensional) {
-    VECTOR2 a{fx(1), -fx(2)}, b{fx(3), fx(5)}, d{}, v{-3, fx(6)};
-    V2mm(&a, &b, &d);
-    V2pp(&a, &b, &b); // out is b
-    V2xx(0x8000, &v);
-    EXPECT_TRUE(d.x == -fx(2) && d.y == -fx(7) && b.x == fx(4) && b.y == fx(3));
-    EXPECT_TRUE(v.x == -2 && v.y == fx(3));
-    const VECTOR2 m{-1, -1}, p{1, 1}, c{fx(3), fx(4)};
-    EXPECT_TRUE(V2dot(&m, &p) == -1 && V2dot(&c, &c) == fx(25)); // -2 >> 16 once
-    // (0, -2.0): s = 4.0, EGL_InvSqrt 32767, times -2.0 is -65534. (0xB6, 0xB6): the squares
-    // are summed before the one shift, so s = 66248 >> 16 = 1 raw unit (shifting each square
-    // gives 0); EGL_InvSqrt(1) is 16785446, times 0xB6 is 46614.
-    VECTOR2 two{0, -fx(2)}, tiny{0xB6, 0xB6};
-    V2norm(&two);
-    V2norm(&tiny);
-    EXPECT_TRUE(two.x == 0 && two.y == -65534 && tiny.x == 46614 && tiny.y == 46614);
+    // The squares of 0xB6 are summed before the one shift: s = 1 raw (0 per square);
+    // EGL_InvSqrt(1) = 16785446, times 0xB6 is 46614. Dot: -2 >> 16 once.
+    VECTOR2 a{fx(1), -fx(2)}, b{fx(3), fx(5)}, t{0xB6, 0xB6};
+    const VECTOR2 m{-1, -1}, p{1, 1};
+    V2pp(&a, &b, &b); // out is b: (4, 3)
+    V2mm(&a, &b, &a); // (-3, -5)
+    V2xx(0x8000, &a);
+    V2norm(&t);
+    EXPECT_TRUE(b.x == fx(4) && b.y == fx(3) && a.x == -0x18000 && a.y == -0x28000);
+    EXPECT_TRUE(t.x == 46614 && t.y == 46614 && V2dot(&m, &p) == -1);
 }
 
 TEST(Ucs, GlobalComposesFramesAndPoints) {
-    const UCS u = tilted();
     UCS out{};
-    GlobalUCS(&u, &kIdentity, &out);
-    EXPECT_TRUE(SameUcs(out, u));
-    GlobalUCS(&kIdentity, &u, &out);
-    EXPECT_TRUE(SameUcs(out, u));
     // origin = (10, 20, 30) + 1 * (0, 1, 0) + 2 * (-1, 0, 0) + 3 * (0, 0, 1) = (8, 21, 33).
     UCS local{{fx(1), fx(2), fx(3)}, {kOne, 0, 0}, {0, 0, kOne}, {0, -kOne, 0}};
     GlobalUCS(&local, &kQuarter, &local); // out is the local system
@@ -163,10 +140,8 @@ TEST(Ucs, GlobalComposesFramesAndPoints) {
 }
 
 TEST(Ucs, InvertIsAGeneralInverseAndRefusesSingularFrames) {
-    // The quarter turn: its transpose, origin -(21, -8, 33). Axes scaled by 2: cofactors 4.0,
-    // determinant 8.0, r = 0x2000, axes 0.5. With origin (3, 0, 0) raw the sum is negated before
-    // its one shift: -(3 * 0x8000) >> 16 = -2, where negating after the shift would give -1.
-    // Singular: zero axes, parallel axes, and axes so tiny every cofactor shifts to 0.
+    // The quarter turn: its transpose. Axes 2.0: determinant 8.0, axes 0.5; origin 3 raw is
+    // negated before the one shift: -(3 * 0x8000) >> 16 = -2, not -1. Then three singular frames.
     const UCS two{{0, 0, 0}, {fx(2), 0, 0}, {0, fx(2), 0}, {0, 0, fx(2)}};
     const UCS half{{0, 0, 0}, {0x8000, 0, 0}, {0, 0x8000, 0}, {0, 0, 0x8000}};
     struct Case {
@@ -174,15 +149,13 @@ TEST(Ucs, InvertIsAGeneralInverseAndRefusesSingularFrames) {
     };
     const Case cases[] = {{{{fx(8), fx(21), fx(33)}, kQuarter.x, kQuarter.y, kQuarter.z},
                            {{-fx(21), fx(8), -fx(33)}, {0, -kOne, 0}, {kOne, 0, 0}, {0, 0, kOne}}},
-                          {{{fx(2), fx(4), fx(6)}, two.x, two.y, two.z},
-                           {{-fx(1), -fx(2), -fx(3)}, half.x, half.y, half.z}},
                           {{{3, 0, 0}, two.x, two.y, two.z}, {{-2, 0, 0}, half.x, half.y, half.z}},
                           {{{fx(5), fx(6), fx(7)}, {0, 0, 0}, {0, 0, 0}, {0, 0, 0}}, kIdentity},
                           {{{0, 0, 0}, {kOne, 0, 0}, {fx(2), 0, 0}, {0, 0, kOne}}, kIdentity},
                           {{{0, 0, 0}, {1, 0, 0}, {0, 1, 0}, {0, 0, 1}}, kIdentity}};
     for (const Case& c : cases) {
         UCS out{{9, 9, 9}, {9, 9, 9}, {9, 9, 9}, {9, 9, 9}};
-        EXPECT_EQ(ucs_invert(&c.u, &out), &c - cases >= 3 ? 1 : 0); // the last three are singular
+        EXPECT_EQ(ucs_invert(&c.u, &out), &c - cases >= 2 ? 1 : 0); // the last three are singular
         EXPECT_TRUE(SameUcs(out, c.want));
     }
 }
@@ -197,15 +170,9 @@ TEST(Ucs, LocalUndoesGlobalAndTakesSingularFramesAsIdentity) {
     EXPECT_TRUE(Same(out, {fx(21), -fx(8), fx(33)}));
     EXPECT_EQ(LocalBase(&p, &singular, &out), 0);
     EXPECT_TRUE(Same(out, p));
-    // The tilted frame's determinant is not exactly 1.0 and its EGL_Inverse carries a relative
-    // error of a few 2^-16: unit-sized values come back within a few raw units, a point at 20.0
-    // within the same relative error.
-    const UCS u = tilted();
-    const VECTOR q{-fx(20), fx(3), 0x4000};
-    VECTOR g{};
-    GlobalBase(&q, &u, &g);
-    EXPECT_EQ(LocalBase(&g, &u, &g), 0); // out is the point
-    EXPECT_TRUE(Same(g, q, 84));
+    // A frame turned by odd angles has a determinant just off 1.0: back within a few raw units.
+    UCS u{{fx(5), -fx(3), 0x20000}, {kOne, 0, 0}, {0, kOne, 0}, {0, 0, kOne}};
+    VRX_RotateUCS(&u, 30, 45, 60);
     const UCS local{{0x8000, -kOne, 0x4000}, {0, kOne, 0}, {0, 0, kOne}, {kOne, 0, 0}};
     UCS a{};
     GlobalUCS(&local, &u, &a);
@@ -221,77 +188,43 @@ TEST(Ucs, RotateTurnsAboutOwnAxesInOrder) {
         int32_t a1, a2, a3;
         UCS want;
     };
-    // X turns into Y, Y into -X: cos 0, sin 65534; whole turns are reduced either way. (X, Y)
-    // first, then (Y, Z): Z' = -F_MUL(65534, -65534) = 65533 along X. 30: cos 56754, sin 32767.
-    const Case cases[] = {
-        {90, 0, 0, {o, {0, kS, 0}, {-kS, 0, 0}, {0, 0, kOne}}},
-        {450, 0, 0, {o, {0, kS, 0}, {-kS, 0, 0}, {0, 0, kOne}}},
-        {-270, 0, 0, {o, {0, kS, 0}, {-kS, 0, 0}, {0, 0, kOne}}},
-        {0, 90, 0, {o, {kOne, 0, 0}, {0, 0, kS}, {0, -kS, 0}}},
-        {0, 0, 90, {o, {0, 0, -kS}, {0, kOne, 0}, {kS, 0, 0}}},
-        {90, 90, 0, {o, {0, kS, 0}, {0, 0, kS}, {65533, 0, 0}}},
-        {30, 0, 0, {o, {56754, 32767, 0}, {-32767, 56754, 0}, {0, 0, kOne}}},
-    };
+    // X turns into Y, Y into -X (sin 65534); 450 and -270 are reduced. (X, Y) first, then (Y, Z):
+    // Z' = -F_MUL(65534, -65534) = 65533 along X. 30: cos 56754, sin 32767.
+    const Case cases[] = {{90, 0, 0, {o, {0, kS, 0}, {-kS, 0, 0}, {0, 0, kOne}}},
+                          {450, 0, 0, {o, {0, kS, 0}, {-kS, 0, 0}, {0, 0, kOne}}},
+                          {-270, 0, 0, {o, {0, kS, 0}, {-kS, 0, 0}, {0, 0, kOne}}},
+                          {0, 90, 0, {o, {kOne, 0, 0}, {0, 0, kS}, {0, -kS, 0}}},
+                          {0, 0, 90, {o, {0, 0, -kS}, {0, kOne, 0}, {kS, 0, 0}}},
+                          {90, 90, 0, {o, {0, kS, 0}, {0, 0, kS}, {65533, 0, 0}}},
+                          {30, 0, 0, {o, {56754, 32767, 0}, {-32767, 56754, 0}, {0, 0, kOne}}}};
     for (const Case& c : cases) {
         UCS u{o, {kOne, 0, 0}, {0, kOne, 0}, {0, 0, kOne}};
         EXPECT_EQ(VRX_RotateUCS(&u, c.a1, c.a2, c.a3), 0);
         EXPECT_TRUE(SameUcs(u, c.want)) << c.a1 << " " << c.a2 << " " << c.a3;
     }
     // About the parent's axes: the (x, y), (y, z) and (z, x) pairs of every axis.
-    void (*const about[3])(VECTOR*, VECTOR*, VECTOR*,
-                           FIXED) = {ucs_rotate_about_z, ucs_rotate_about_x, ucs_rotate_about_y};
-    const UCS parent[3] = {{{0, 0, 0}, {0, -kS, 0}, {kS, 0, 0}, {0, 0, kOne}},
-                           {{0, 0, 0}, {kOne, 0, 0}, {0, 0, -kS}, {0, kS, 0}},
-                           {{0, 0, 0}, {0, 0, kS}, {0, kOne, 0}, {-kS, 0, 0}}};
-    for (int i = 0; i < 3; ++i) {
-        UCS u = kIdentity;
-        about[i](&u.x, &u.y, &u.z, 90 * kOne);
-        EXPECT_TRUE(SameUcs(u, parent[i])) << i;
-    }
-}
-
-TEST(Ucs, ReverseRotateRestoresTheAxes) {
-    // Quarter turns come back within a few raw units (each turn shrinks the axes by the table's
-    // 65534). Other angles only within about 0.3 %: the reverse turn by -a is reduced to 360 - a
-    // whole degrees, and 360 degrees are 411840 raw radians, 65 more than a turn, so the sine and
-    // cosine phases of the two turns do not mirror exactly.
-    const int32_t cases[][4] = {{90, 90, 90, 12},     {180, -90, 270, 12},
-                                {INT32_MIN, 0, 0, 8}, {-170, 95, 3, 300},
-                                {0, 359, 0, 200},     {INT32_MIN, 1000, -7, 300}};
-    for (const auto& c : cases) {
-        const UCS start = tilted();
-        UCS u = start;
-        EXPECT_EQ(VRX_RotateUCS(&u, c[0], c[1], c[2]), 0);
-        EXPECT_EQ(VRX_ReverseRotateUCS(&u, c[0], c[1], c[2]), 0);
-        EXPECT_TRUE(SameUcs(u, start, c[3])) << c[0] << " " << c[1] << " " << c[2];
-    }
+    UCS z = kIdentity, x = kIdentity, y = kIdentity;
+    ucs_rotate_about_z(&z.x, &z.y, &z.z, 90 * kOne);
+    ucs_rotate_about_x(&x.x, &x.y, &x.z, 90 * kOne);
+    ucs_rotate_about_y(&y.x, &y.y, &y.z, 90 * kOne);
+    EXPECT_TRUE(SameUcs(z, {{0, 0, 0}, {0, -kS, 0}, {kS, 0, 0}, {0, 0, kOne}}));
+    EXPECT_TRUE(SameUcs(x, {{0, 0, 0}, {kOne, 0, 0}, {0, 0, -kS}, {0, kS, 0}}));
+    EXPECT_TRUE(SameUcs(y, {{0, 0, 0}, {0, 0, kS}, {0, kOne, 0}, {-kS, 0, 0}}));
 }
 
 TEST(Ucs, PairTurnArithmetic) {
-    // -30 reduces to 330 degrees = 377520 raw radians (the exact mirror of 30 degrees would be
-    // 377455): sine phase -341 reads entry 340 (32680) negated, cosine phase 683 (56805).
-    // a.x = F_MUL(56805, 56754) + F_MUL(-32680, -32767) = 49192 + 16339,
-    // a.y = F_MUL(56805, 32767) + F_MUL(-32680, 56754) = 28401 - 28301,
-    // b.x = F_MUL(56805, -32767) - F_MUL(-32680, 56754) = -28402 + 28301,
-    // b.y = F_MUL(56805, 56754) - F_MUL(-32680, 32767) = 49192 + 16340.
-    VECTOR a{kOne, 0, 0}, b{0, kOne, 0};
-    ucs_rotate_pair(&a, &b, 30);
-    ucs_rotate_pair(&a, &b, -30);
-    EXPECT_TRUE(Same(a, {65531, 100, 0}));
-    EXPECT_TRUE(Same(b, {-101, 65532, 0}));
-    // Each product is shifted by itself: F_MUL(56754, 1) + F_MUL(32767, 1) = 0 (one shift of
-    // the sum would give 1); with -1 raw, -1 + -1 and -1 - (-1).
+    // The reverse of 30 turns by 330 degrees = 377520 raw radians (not the mirror, 377455): sin
+    // -32680 (entry 340), cos 56805. X.x = F_MUL(56805, 56754) + F_MUL(-32680, -32767) = 49192 +
+    // 16339, X.y = 28401 - 28301; Y.x = -28402 + 28301, Y.y = 49192 + 16340.
+    UCS u = kIdentity;
+    VRX_RotateUCS(&u, 30, 0, 0);
+    EXPECT_EQ(VRX_ReverseRotateUCS(&u, 30, 0, 0), 0);
+    EXPECT_TRUE(SameUcs(u, {{0, 0, 0}, {65531, 100, 0}, {-101, 65532, 0}, {0, 0, kOne}}));
+    // Each product is shifted alone: F_MUL(56754, 1) + F_MUL(32767, 1) = 0, not 1; -1 + -1 for -1.
     VECTOR p{1, 0, -1}, q{1, 0, -1};
     ucs_rotate_pair(&p, &q, 30);
     EXPECT_TRUE(Same(p, {0, 0, -2}));
     EXPECT_TRUE(Same(q, {0, 0, 0}));
-    // 3630 whole degrees reduce to 30. As FIXED degrees the radian angle 4152720 is not
-    // reduced: the 32-bit phase product wraps to 363196640, sine phase 346 (33202).
-    VECTOR c{kOne, 0, 0}, d{0, kOne, 0}, e{kOne, 0, 0}, f{0, kOne, 0};
-    ucs_rotate_pair(&c, &d, 3630);
-    ucs_rotate_pair_f(&e, &f, 3630 * kOne);
-    EXPECT_TRUE(Same(c, {56754, 32767, 0}));
-    EXPECT_TRUE(e.y == 33202 && f.x == -33202);
 }
 
 } // namespace
