@@ -69,15 +69,4 @@ TEST_F(EngineTest, DepthAfterLeavingDoubledModeWhileSortingGetsABuffer) {
     EXPECT_EQ(last_error(), "Allocate depth buffer fail in VRX_Hint!!\n");
 }
 
-TEST(Hints, HintsBeforeOpenAreLostAtOpen) {
-    VRX_Close();
-    EXPECT_EQ(g_eng.eng_flags, 4u);
-    EXPECT_EQ(VRX_Hint(HINT_PERSPECTIVE, 1), 0);
-    EXPECT_EQ(VRX_Hint(HINT_DOUBLED, 1), 0); // nothing to double before an open
-    EXPECT_EQ(g_eng.eng_flags, 5u);
-    ASSERT_EQ(VRX_Open(0, 16, 16, VRX_FMT_RGB565), 0);
-    EXPECT_EQ(g_eng.eng_flags, 0u);
-    VRX_Close();
-}
-
 } // namespace

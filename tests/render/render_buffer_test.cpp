@@ -79,8 +79,13 @@ TEST_F(EngineTest, BlockCopiesRoundTripAndRespectTheBuffer) {
     EXPECT_EQ(out, in);
     EXPECT_EQ(zout, zin);
 
-    // Null depth array: colours only.
+    // Null depth array: colours only. A null colour buffer handed over keeps the current one.
     ASSERT_EQ(VRX_CopyFromRenderBuffer(237, 318, 3, 1, out.data(), nullptr), 0);
+    std::vector<int32_t> depth(kW * kH);
+    ASSERT_EQ(VRX_SetRenderBuffer(nullptr, depth.data()), 0);
+    EXPECT_EQ(g_eng.depth_buf, depth.data());
+    EXPECT_EQ(g_eng.color_buf, color.data());
+    ASSERT_EQ(VRX_SetRenderBuffer(nullptr, g_eng.own_depth_buf), 0);
 
     struct Bad {
         int x, y, w, h;
@@ -106,23 +111,6 @@ TEST(RenderBuffer, OperationsWithoutAColourBufferAreRefused) {
     EXPECT_STREQ(g_eng.last_error, "No render buffer in VRX_ClearRenderBuffer!!\n"
                                    "No render buffer in VRX_CopyToRenderBuffer!!\n");
     VRX_Close();
-}
-
-TEST_F(EngineTest, GetAndSetRenderBuffer) {
-    int32_t w = 0, h = 0;
-    uint16_t* c = nullptr;
-    int32_t* z = nullptr;
-    ASSERT_EQ(VRX_GetRenderBuffer(&w, &h, &c, &z), 0);
-    EXPECT_EQ((std::array{w, h}), (std::array{kW, kH}));
-    EXPECT_EQ(c, color.data());
-    EXPECT_EQ(z, g_eng.own_depth_buf);
-    EXPECT_EQ(VRX_GetRenderBuffer(nullptr, nullptr, nullptr, nullptr), 0);
-
-    std::vector<int32_t> depth(kW * kH);
-    ASSERT_EQ(VRX_SetRenderBuffer(nullptr, depth.data()), 0);
-    EXPECT_EQ(g_eng.depth_buf, depth.data());
-    EXPECT_EQ(g_eng.color_buf, color.data()); // null keeps the colour buffer
-    ASSERT_EQ(VRX_SetRenderBuffer(nullptr, g_eng.own_depth_buf), 0);
 }
 
 TEST_F(EngineTest, DoubledModeDrawsAtTwiceTheSizeAndSwapReduces) {
