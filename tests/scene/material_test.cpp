@@ -180,6 +180,11 @@ TEST_F(Materials, DuplicateCopiesAllButNameAndUsesAndClearFreesAll) {
     char buf[16] = "xxxxxxxxxxxxxxx";
     ASSERT_EQ(VRX_GetMaterialName(d, buf), 0);
     EXPECT_STREQ(buf, "Chrome");
+    void* found = nullptr; // the first of the two in list order, in any case; none: 1
+    EXPECT_EQ(VRX_GetMaterialByName("CHROME", &found), 0);
+    EXPECT_EQ(found, src);
+    EXPECT_EQ(VRX_GetMaterialByName("Gold", &found), 1);
+    EXPECT_EQ(found, nullptr);
     // An unnamed source gives an unnamed copy, whose name reads as empty.
     ASSERT_EQ(VRX_DuplicateMaterial(make(), &h), 0);
     ASSERT_EQ(VRX_GetMaterialName(h, buf), 0);
