@@ -247,8 +247,12 @@ void cam_pan_to(CAMERA* c, const VECTOR& p) noexcept {
     if (is_zero(d) || engine::magnitude(engine::vec_dot(d, u.z)) > kPanToLimit) return;
 
     const VECTOR old_y = u.y;
-    const bool from_y = engine::magnitude(engine::vec_dot(old_y, d)) < kNearParallel;
-    VECTOR y = from_y ? old_y : u.z;
+    const FIXED along_y = engine::vec_dot(old_y, d);
+    const bool from_y = engine::magnitude(along_y) < kNearParallel;
+    // Looking along the old Y, start from the old Z the way a tilt toward d carries the top
+    // (backward when looking up), so that the choice stands when the old Y has no side.
+    const VECTOR z_back{-u.z.x, -u.z.y, -u.z.z};
+    VECTOR y = from_y ? old_y : (along_y > 0 ? z_back : u.z);
     // Drop the part along d. d is unit only to the normalisation's precision (about 2e-4
     // for long vectors), which leaves a residue along d; a second pass removes it.
     y = sub_scaled(y, engine::vec_dot(y, d), d);

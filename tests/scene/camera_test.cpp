@@ -124,7 +124,8 @@ TEST_F(CameraTest, TurnsMoveTheTargetOrTheEye) {
     // Y' = cos Y + sin X, products truncated alone. Pan, tilt: r = 1 / (1 / sqrt(100.0)) = 655407.
     // Arcs 30: rs = 327693, rc = 567580. Global arc 90 then up 30: h = EGL_Sqrt(100.0) = 655407.
     // Pan to: Y from the old Y, or the old Z when looking along the old Y, turned to the old Y's
-    // side; X = Y x Z. Near the view or its reverse, or on the eye, nothing changes.
+    // side (with no side, backward when looking up, as a tilt); X = Y x Z. Near the view or its
+    // reverse, or on the eye, nothing changes.
     auto with_y = [](VECTOR y, Op op) -> Op {
         return [=](void* c) {
             static_cast<CAMERA*>(c)->ucs.y = y;
@@ -156,6 +157,9 @@ TEST_F(CameraTest, TurnsMoveTheTargetOrTheEye) {
         {call(VRX_PanCameraTo, &to[0]), {0, E, 0, 0, 0, 0, -E, 0, E, 0, E, 0, 0}},
         {with_y({0x2000, E, -0x2000}, call(VRX_PanCameraTo, &to[1])),
          {0, 0, E, 0, E, 0, 0, 0, 0, -E, 0, E, 0}},
+        {with_y({0x2000, E, 0x2000}, call(VRX_PanCameraTo, &to[1])),
+         {0, 0, E, 0, -E, 0, 0, 0, 0, E, 0, E, 0}},
+        {call(VRX_PanCameraTo, &to[1]), {0, 0, E, 0, E, 0, 0, 0, 0, -E, 0, E, 0}}, // as a tilt
         {call(VRX_PanCameraTo, &to[2]), {0, 0, 0, T, E, 0, 0, 0, E, 0, 0, 0, E}},
         {call(VRX_PanCameraTo, &to[3]), {0, 0, 0, T, E, 0, 0, 0, E, 0, 0, 0, E}},
         {call(VRX_PanCameraTo, &to[4]), {0, 0, 0, T, E, 0, 0, 0, E, 0, 0, 0, E}}};
