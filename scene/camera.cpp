@@ -370,6 +370,24 @@ bool present(const void* p, const char* what, const char* op) noexcept {
     return false;
 }
 
+// The getters: one camera field copied out.
+template <class T> int32_t get_field(void* camera, T* out, T CAMERA::*field, const char* op) {
+    CAMERA* c = camera_arg(camera, op);
+    if (!c || !present(out, "out", op)) return -1;
+    *out = c->*field;
+    return 0;
+}
+
+// A clip distance and the half-extent of the view at that distance.
+int32_t set_clip(void* camera, FIXED distance, FIXED CAMERA::*clip, FIXED CAMERA::*extent,
+                 const char* op) {
+    CAMERA* c = camera_arg(camera, op);
+    if (!c) return -1;
+    c->*clip = distance;
+    c->*extent = engine::f_mul(distance, c->tan_half);
+    return 0;
+}
+
 } // namespace
 
 // Host-visible records: layouts fixed by the interface.
@@ -562,40 +580,24 @@ VRX_API int32_t VRX_SetCameraAt(void* camera, const VECTOR* at) noexcept {
 }
 
 VRX_API int32_t VRX_GetCameraAt(void* camera, VECTOR* at) noexcept {
-    CAMERA* c = camera_arg(camera, "ENG_GetCamAt");
-    if (!c || !present(at, "out", "ENG_GetCamAt")) return -1;
-    *at = c->at;
-    return 0;
+    return get_field(camera, at, &CAMERA::at, "ENG_GetCamAt");
 }
 
 VRX_API int32_t VRX_SetCameraNearClip(void* camera, FIXED distance) noexcept {
-    CAMERA* c = camera_arg(camera, "ENG_SetCamNearClip");
-    if (!c) return -1;
-    c->near_clip = distance;
-    c->near_extent = engine::f_mul(distance, c->tan_half);
-    return 0;
+    return set_clip(camera, distance, &CAMERA::near_clip, &CAMERA::near_extent,
+                    "ENG_SetCamNearClip");
 }
 
 VRX_API int32_t VRX_GetCameraNearClip(void* camera, FIXED* distance) noexcept {
-    CAMERA* c = camera_arg(camera, "ENG_GetCamNearClip");
-    if (!c || !present(distance, "out", "ENG_GetCamNearClip")) return -1;
-    *distance = c->near_clip;
-    return 0;
+    return get_field(camera, distance, &CAMERA::near_clip, "ENG_GetCamNearClip");
 }
 
 VRX_API int32_t VRX_SetCameraFarClip(void* camera, FIXED distance) noexcept {
-    CAMERA* c = camera_arg(camera, "ENG_SetCamFarClip");
-    if (!c) return -1;
-    c->far_clip = distance;
-    c->far_extent = engine::f_mul(distance, c->tan_half);
-    return 0;
+    return set_clip(camera, distance, &CAMERA::far_clip, &CAMERA::far_extent, "ENG_SetCamFarClip");
 }
 
 VRX_API int32_t VRX_GetCameraFarClip(void* camera, FIXED* distance) noexcept {
-    CAMERA* c = camera_arg(camera, "ENG_GetCamFarClip");
-    if (!c || !present(distance, "out", "ENG_GetCamFarClip")) return -1;
-    *distance = c->far_clip;
-    return 0;
+    return get_field(camera, distance, &CAMERA::far_clip, "ENG_GetCamFarClip");
 }
 
 VRX_API int32_t VRX_GetShootingVector(void* camera, int32_t sx, int32_t sy, VECTOR* out) noexcept {
