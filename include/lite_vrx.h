@@ -51,6 +51,22 @@ typedef struct UCS {
     VECTOR x, y, z;
 } UCS;
 
+/* A mesh vertex: position, normal and texture coordinates (32 bytes). */
+typedef struct VERTEX {
+    VECTOR pos;
+    VECTOR normal;
+    FIXED u, v;
+} VERTEX;
+
+/* One triangle of VRX_GetObjectPolygons and VRX_RenderPolygonList: a frame whose origin is
+   the reference point (axes unit), the material, then three vertices whose positions are
+   relative to the reference point and whose normals are in world coordinates. */
+typedef struct POLYGON {
+    UCS ucs;
+    void* material;
+    VERTEX v[3];
+} POLYGON;
+
 /* Host geometry of a window, in screen pixels. */
 typedef struct WINDOW_INFO {
     int32_t x, y;

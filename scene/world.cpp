@@ -8,6 +8,7 @@
 #include "engine/error.h"
 #include "engine/fixed.h"
 #include "engine/state.h"
+#include "scene/object.h"
 #include "lite_vrx.h"
 
 namespace vrx::scene {
@@ -31,12 +32,22 @@ template <class T>
     head = tail = nullptr;
 }
 
+void free_object_tree(OBJECT* o) noexcept {
+    FreeObjectTree(o, true);
+}
+
+// The clear-all frees every material first, so its objects must not release their uses.
+void free_object_tree_cleared(OBJECT* o) noexcept {
+    FreeObjectTree(o, false);
+}
+
 // Frees what a world owns, in the order the engine requires: the objects of its list with
 // their whole child trees, then its omni lights, then its billboards. A kind plugs in as
 // release_list(w->obj_head, w->obj_tail, <its free>); while no record of a kind can be
 // linked into a world, its list is always empty and only its ends are cleared.
-void release_contents(WORLD* w) noexcept {
-    w->obj_head = w->obj_tail = nullptr;
+void release_contents(WORLD* w, bool clearing_all) noexcept {
+    release_list(w->obj_head, w->obj_tail,
+                 clearing_all ? free_object_tree_cleared : free_object_tree);
     w->omni_head = w->omni_tail = nullptr;
     w->bb_head = w->bb_tail = nullptr;
 }
@@ -70,14 +81,14 @@ WORLD* world_create(uint32_t visible) noexcept {
 
 void world_delete(WORLD* w) noexcept {
     UnlinkWorld(w);
-    release_contents(w);
+    release_contents(w, false);
     engine::free_record(w);
 }
 
 int32_t clear_worlds() noexcept {
     for (WORLD* w = g_eng.world_list.head; w;) {
         WORLD* next = w->next;
-        release_contents(w);
+        release_contents(w, true);
         engine::free_record(w);
         w = next;
     }
