@@ -49,6 +49,12 @@ void release_buffers() noexcept {
 
 } // namespace
 
+bool refuse_closed(const char* fn) noexcept {
+    if (g_eng.is_open) return false;
+    ReportError("%s: the engine is not open!!\n", fn);
+    return true;
+}
+
 int32_t ClearAllObjects() noexcept {
     for (const ClearStep& step : kClearSteps) {
         if (step.run() != 0) {
