@@ -6,6 +6,8 @@
 #include <type_traits>
 
 #include "engine/alloc.h"
+#include "engine/vector.h"
+#include "scene/hierarchy.h"
 #include "scene/keyframe.h"
 #include "scene/lod.h"
 #include "scene/material.h"
@@ -120,6 +122,50 @@ void UnlinkObjectFromWorld(OBJECT* o) noexcept {
     else if (w && w->obj_tail == o)
         w->obj_tail = o->prev;
     o->prev = o->next = nullptr;
+}
+
+namespace {
+
+// Widens [lo, hi] by p; the first point sets both corners.
+void widen(bool& first, VECTOR& lo, VECTOR& hi, const VECTOR& p) noexcept {
+    if (first) {
+        lo = hi = p;
+        first = false;
+        return;
+    }
+    lo = {p.x < lo.x ? p.x : lo.x, p.y < lo.y ? p.y : lo.y, p.z < lo.z ? p.z : lo.z};
+    hi = {p.x > hi.x ? p.x : hi.x, p.y > hi.y ? p.y : hi.y, p.z > hi.z ? p.z : hi.z};
+}
+
+} // namespace
+
+void object_calc_bbox(OBJECT* o) noexcept {
+    bool first = true;
+    VECTOR lo = o->bbox_min, hi = o->bbox_max;
+    for (OBJECT* c = o->first_child; c; c = c->next) {
+        for (int i = 0; i < 8; ++i) {
+            const VECTOR corner{(i & 1) ? c->bbox_max.x : c->bbox_min.x,
+                                (i & 2) ? c->bbox_max.y : c->bbox_min.y,
+                                (i & 4) ? c->bbox_max.z : c->bbox_min.z};
+            VECTOR p{};
+            engine::base_to_global(corner, c->local_ucs, p);
+            widen(first, lo, hi, p);
+        }
+    }
+    if (o->geo)
+        for (int32_t i = 0; i < o->geo->num_vertexs; ++i)
+            widen(first, lo, hi, o->geo->vertexs[i].pos);
+    o->bbox_min = lo;
+    o->bbox_max = hi;
+    VECTOR sum{};
+    engine::vec_add(lo, hi, sum);
+    o->center = {engine::F_MUL(sum.x, 0x8000), engine::F_MUL(sum.y, 0x8000),
+                 engine::F_MUL(sum.z, 0x8000)};
+    hie_refresh_tree(o);
+    VECTOR diag{}, world_diag{};
+    engine::vec_sub(hi, lo, diag);
+    engine::dir_to_global(diag, o->global_ucs, world_diag);
+    o->radius = engine::vec_len(world_diag) >> 1;
 }
 
 } // namespace vrx::scene

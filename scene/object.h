@@ -122,6 +122,11 @@ void object_set_world(OBJECT* o, WORLD* w) noexcept;
 void LinkObjectToWorld(OBJECT* o) noexcept;
 void UnlinkObjectFromWorld(OBJECT* o) noexcept;
 
+// ENG_CalcObjectBBox: rebuilds bbox_min/bbox_max from the children's box corners (in the
+// object's coordinates) and the object's own vertices, keeping the old box when there is
+// neither; then center, a tree refresh, and radius from the box diagonal in world scale.
+void object_calc_bbox(OBJECT* o) noexcept;
+
 // Applies f to an object and then to every descendant, parent before children.
 template <class F> void for_each_in_tree(OBJECT* o, F&& f) noexcept {
     f(o);
